@@ -1,0 +1,17 @@
+#pragma once
+
+#include <QString>
+
+/**
+ * Every user-visible text is looked up here by its English text in the Qt translation context
+ * "LocalizedStrings"; the key is its own fallback. Each key is translated once per process and
+ * then served from a cache, so translators must be installed before the first lookup.
+ * Main thread only.
+ */
+QString LocalizedString(const QString& key);
+
+/** The key as UTF-8 bytes. */
+QString LocalizedString(const char* key);
+
+/** The same lookup, for window code. */
+QString LocalizedStringNS(const char* key);
