@@ -1,0 +1,18 @@
+#pragma once
+
+#include <QStringList>
+
+/**
+ * The command-line mode: `pelmo COMMAND ARGS...`. Each command takes its own arguments (the
+ * command name removed) and answers the process exit status: 0 on success, 1 when the work
+ * failed, 2 on a usage error. Commands never wait for input they were not given.
+ */
+namespace Commands {
+
+/** Runs the command named by args[0]; prints the usage and answers 2 when it is unknown. */
+int run(const QStringList& args);
+
+/** The usage text for every command. */
+QString usage();
+
+} // namespace Commands
