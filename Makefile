@@ -1,8 +1,10 @@
 # Thin wrapper over CMake. Every target installs missing Debian packages first.
 BUILD_TEST ?= build/test
+BUILD_FUZZ ?= build/fuzz
 JOBS ?= 2
+FUZZ_SECONDS ?= 60
 
-.PHONY: all deps test clean
+.PHONY: all deps test fuzz clean
 
 all: test
 
@@ -14,6 +16,20 @@ test: deps
 	cmake -S . -B $(BUILD_TEST) -G Ninja -DCMAKE_BUILD_TYPE=Debug -DPELMO_SANITIZE=ON -DPELMO_BUILD_TESTS=ON
 	cmake --build $(BUILD_TEST) -j $(JOBS)
 	cd $(BUILD_TEST) && ctest --output-on-failure -j $(JOBS)
+
+# Builds the libFuzzer targets with clang and runs each for FUZZ_SECONDS, keeping its corpus in
+# $(BUILD_FUZZ)/corpus/<target> and anything it finds in $(BUILD_FUZZ)/artifacts/.
+fuzz: deps
+	CC=clang CXX=clang++ cmake -S . -B $(BUILD_FUZZ) -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo \
+	  -DPELMO_FUZZ=ON -DPELMO_BUILD_TESTS=OFF
+	cmake --build $(BUILD_FUZZ) -j $(JOBS)
+	@set -e; for target in $(BUILD_FUZZ)/fuzzers/*; do \
+	  name=$$(basename $$target); \
+	  mkdir -p $(BUILD_FUZZ)/corpus/$$name $(BUILD_FUZZ)/artifacts; \
+	  echo "fuzz: $$name for $(FUZZ_SECONDS) s"; \
+	  $$target -max_total_time=$(FUZZ_SECONDS) -print_final_stats=1 \
+	    -artifact_prefix=$(BUILD_FUZZ)/artifacts/$$name- $(BUILD_FUZZ)/corpus/$$name; \
+	done
 
 clean:
 	rm -rf build
