@@ -1,10 +1,11 @@
 # Thin wrapper over CMake. Every target installs missing Debian packages first.
 BUILD_TEST ?= build/test
 BUILD_FUZZ ?= build/fuzz
+BUILD_BENCH ?= build/bench
 JOBS ?= 2
 FUZZ_SECONDS ?= 60
 
-.PHONY: all deps test fuzz clean
+.PHONY: all deps test bench fuzz clean
 
 all: test
 
@@ -30,6 +31,12 @@ fuzz: deps
 	  $$target -max_total_time=$(FUZZ_SECONDS) -print_final_stats=1 \
 	    -artifact_prefix=$(BUILD_FUZZ)/artifacts/$$name- $(BUILD_FUZZ)/corpus/$$name; \
 	done
+
+# Benchmarks run an optimised build and print their figures as ratios against a peer.
+bench: deps
+	cmake -S . -B $(BUILD_BENCH) -G Ninja -DCMAKE_BUILD_TYPE=Release -DPELMO_BUILD_TESTS=OFF -DPELMO_BUILD_BENCH=ON
+	cmake --build $(BUILD_BENCH) -j $(JOBS)
+	$(BUILD_BENCH)/bench/relink_bench
 
 clean:
 	rm -rf build

@@ -16,7 +16,10 @@ struct Command {
 };
 
 // One row per command, in the order the usage lists them.
-const std::vector<Command> kCommands = {};
+const std::vector<Command> kCommands = {
+    {"relink", relink,
+     "pelmo relink BASE-URL [FILE]  print FILE (or standard input) relinked against BASE-URL"},
+};
 
 } // namespace
 

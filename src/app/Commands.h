@@ -15,4 +15,6 @@ int run(const QStringList& args);
 /** The usage text for every command. */
 QString usage();
 
+int relink(const QStringList& args);
+
 } // namespace Commands
