@@ -6,7 +6,7 @@
 #include <algorithm>
 #include <cctype>
 #include <cerrno>
-#include <climits>
+#include <cstdint>
 #include <cstring>
 #include <fcntl.h>
 #include <new>

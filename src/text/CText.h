@@ -6,7 +6,6 @@
 #include <QString>
 
 #include <concepts>
-#include <cstddef>
 #include <cstdint>
 #include <filesystem>
 #include <memory>
@@ -48,7 +47,10 @@ public:
 
     /** The empty text with a buffer of one block. */
     CText();
-    /** A null s gives the no-buffer state. */
+    /**
+     * A null s gives the no-buffer state. Explicit, as are the number forms: no C string or
+     * number turns into a CText unasked.
+     */
     explicit CText(const char* s);
     /**
      * As CText(s), growing by the given block; a block below 1 is taken as default_block.
@@ -137,7 +139,8 @@ public:
 
     // Report lines for diagnostic listings. The pretty forms append "\t\t", name, " : ", value,
     // "\r\r"; the plain ones name, " ", value, then a bullet (U+2022 in UTF-8) and "\r". List
-    // elements are separated by ",".
+    // elements are separated by ",". A string literal as value goes through CString256 and is
+    // cut at 255 bytes; pass a CText for longer values.
 
     void pretty_append_named_value(const char* name, const CText& value);
     void pretty_append_named_value(const char* name, const CString256& value);
