@@ -16,7 +16,9 @@ struct Command {
 };
 
 // One row per command, in the order the usage lists them.
-const std::vector<Command> kCommands = {};
+const std::vector<Command> kCommands = {
+    {"contacts", contacts, "contacts import FILE\n  contacts list [--group NAME]"},
+};
 
 } // namespace
 
