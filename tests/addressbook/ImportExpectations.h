@@ -35,6 +35,30 @@ inline void expectContacts(const QList<ImportedContact>& actual,
     }
 }
 
+// A table row: a text and the contacts it gives.
+struct ParseCase {
+    const char* name;
+    QByteArray text;
+    QList<ExpectedContact> expected;
+};
+
+// A table row: a malformed text, the line blamed and the whole reason.
+struct BadCase {
+    const char* name;
+    QByteArray text;
+    int line;
+    const char* reason;
+};
+
+inline void PrintTo(const ParseCase& row, std::ostream* out) {
+    *out << row.name;
+}
+inline void PrintTo(const BadCase& row, std::ostream* out) {
+    *out << row.name;
+}
+
+using Parser = QList<ImportedContact> (*)(const QByteArray&);
+
 // Runs parse and answers the failure it raises; a parse that succeeds fails the test.
 inline std::pair<int, QString> importFailure(const std::function<void()>& parse) {
     try {
@@ -45,4 +69,10 @@ inline std::pair<int, QString> importFailure(const std::function<void()>& parse)
     }
     ADD_FAILURE() << "the text was accepted";
     return {-1, QString()};
+}
+
+inline void expectRefused(Parser parse, const BadCase& row) {
+    const auto [line, reason] = importFailure([&] { parse(row.text); });
+    EXPECT_EQ(line, row.line);
+    EXPECT_EQ(reason, QString::fromUtf8(row.reason));
 }
