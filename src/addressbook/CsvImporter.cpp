@@ -176,9 +176,7 @@ std::optional<ImportedContact> contactOf(const Record& row, const QHash<Column, 
     if (first.isEmpty() && last.isEmpty())
         ImportText::splitFullName(field(Column::FullName), person.firstName, person.lastName);
     for (const QString& address : listField(field(Column::Email))) {
-        if (!ImportText::isPlausibleAddress(address))
-            throw ImportError(row.line,
-                              LocalizedString("\"%1\" is not an e-mail address").arg(address));
+        ImportText::requireAddress(address, row.line);
         person.emails.append(address);
     }
     person.primary = person.emails.isEmpty() ? -1 : 0;

@@ -1,5 +1,8 @@
 #include "addressbook/ImportText.h"
 
+#include "addressbook/ImportError.h"
+#include "util/LocalizedStrings.h"
+
 #include <QStringDecoder>
 
 std::optional<QString> ImportText::decode(const QByteArray& bytes, const QString& charset) {
@@ -32,6 +35,11 @@ bool ImportText::isPlausibleAddress(const QString& address) {
             return false;
     }
     return true;
+}
+
+void ImportText::requireAddress(const QString& address, int line) {
+    if (!isPlausibleAddress(address))
+        throw ImportError(line, LocalizedString("\"%1\" is not an e-mail address").arg(address));
 }
 
 void ImportText::splitFullName(const QString& fullName, QString& first, QString& last) {

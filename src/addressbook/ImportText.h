@@ -23,6 +23,8 @@ public:
      * control character, angle bracket, comma or semicolon anywhere.
      */
     static bool isPlausibleAddress(const QString& address);
+    /** Throws ImportError for line unless the address is plausible. */
+    static void requireAddress(const QString& address, int line);
     /**
      * Splits a display name at its last space: "Ada King Lovelace" gives "Ada King" and
      * "Lovelace"; a single word is a first name and leaves last null.

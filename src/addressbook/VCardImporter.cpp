@@ -285,9 +285,7 @@ struct Card {
         const QString address = unescaped(decodedValue(property, line), version21).trimmed();
         if (address.isEmpty())
             return;
-        if (!ImportText::isPlausibleAddress(address))
-            throw ImportError(line,
-                              LocalizedString("\"%1\" is not an e-mail address").arg(address));
+        ImportText::requireAddress(address, line);
         int rank = property.hasParam("TYPE", "PREF") ? 1 : 101;
         bool numeric = false;
         const int pref = property.param("PREF").toInt(&numeric);
