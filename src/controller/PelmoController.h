@@ -47,7 +47,6 @@ public:
 
     /** The message body; owned by the controller, shared with the window's editor. */
     QTextDocument* message() const { return body; }
-    PelmoView& view() const { return window; }
 
     // Settings and fields. Every getter that reads a setting syncs the settings store first,
     // so a change saved by the preferences (or another process) is seen by the next call.
@@ -132,7 +131,6 @@ public:
     void addRecipient(const QString& address);
     /** Forgets every mailed address. */
     void resetRecipients();
-    const QStringList& getRecipients() const { return recipients; }
 
     // The sent-recipients table: column "index" shows the row number from 1, "email" the
     // address; anything else, or a row out of range, shows nothing (an invalid QVariant).
