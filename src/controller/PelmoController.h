@@ -153,7 +153,10 @@ public Q_SLOTS:
      */
     void abRecordSelected(const QList<qint64>& personIds, const QStringList& selectedAddresses,
                           bool pickerIsKeyWindow);
-    /** The user edited a field: editing To or Name drops the pending group selection. */
+    /**
+     * The user edited a field: editing To or Name drops the pending group selection. Text the
+     * controller puts in a field is no edit and must not be reported.
+     */
     void textDidChange(PelmoView::Field field);
 
 Q_SIGNALS:

@@ -38,7 +38,8 @@ extern CLog* gLogger;
 
 /**
  * Opens <data folder>/Pelmo.log and makes it the process's log. Logging stays off when the
- * folder cannot be made or the path does not fit in 255 bytes. Called once per launch.
+ * folder cannot be made or the path does not fit in 255 bytes. Called once per launch; a
+ * second call first closes the log it replaces, stop marker included.
  */
 void StartLogging();
 /** Writes the stop marker, closes the log and turns logging off; nothing when it is off. */
