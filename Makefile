@@ -32,11 +32,11 @@ fuzz: deps
 	    -artifact_prefix=$(BUILD_FUZZ)/artifacts/$$name- $(BUILD_FUZZ)/corpus/$$name; \
 	done
 
-# Benchmarks run an optimised build and print their figures as ratios against a peer.
+# Benchmarks build optimised and without sanitizers; each prints its figures.
 bench: deps
 	cmake -S . -B $(BUILD_BENCH) -G Ninja -DCMAKE_BUILD_TYPE=Release -DPELMO_BUILD_TESTS=OFF -DPELMO_BUILD_BENCH=ON
 	cmake --build $(BUILD_BENCH) -j $(JOBS)
-	$(BUILD_BENCH)/bench/relink_bench
+	@for b in $(BUILD_BENCH)/bench/*_bench; do echo "== $$b"; "$$b" || exit 1; done
 
 clean:
 	rm -rf build

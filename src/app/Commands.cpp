@@ -17,8 +17,12 @@ struct Command {
 
 // One row per command, in the order the usage lists them.
 const std::vector<Command> kCommands = {
+    {"contacts", contacts,
+     "pelmo contacts import FILE          add a vCard (.vcf) or CSV file to the address book\n"
+     "  pelmo contacts list [--group NAME]  list everyone, or the members of one group"},
     {"relink", relink,
-     "pelmo relink BASE-URL [FILE]  print FILE (or standard input) relinked against BASE-URL"},
+     "pelmo relink BASE-URL [FILE]        print FILE (or standard input) relinked against "
+     "BASE-URL"},
 };
 
 } // namespace

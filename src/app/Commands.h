@@ -15,6 +15,13 @@ int run(const QStringList& args);
 /** The usage text for every command. */
 QString usage();
 
+/**
+ * `contacts import FILE`: adds a vCard or CSV file to the address book, all of it or nothing.
+ * `contacts list [--group NAME]`: prints every person, or a group's members in order, one
+ * "First Last <address>" per line.
+ */
+int contacts(const QStringList& args);
+
 int relink(const QStringList& args);
 
 } // namespace Commands

@@ -2,6 +2,8 @@
 
 #include "text/CString256.h"
 
+#include <QDateTime>
+
 #include <cstdio>
 #include <cstring>
 #include <new>
@@ -154,4 +156,14 @@ void ElapsedTimeMessage(uint32_t seconds, CString256& text) {
     appendUnit(text, seconds / 3600, " hr ", " hrs ");
     appendUnit(text, seconds % 3600 / 60, " min ", " mins ");
     appendUnit(text, seconds % 60, " sec ", " secs ");
+}
+
+QString DateDescription(const QDateTime& date) {
+    const int offset = date.offsetFromUtc() / 60;
+    const int magnitude = offset < 0 ? -offset : offset;
+    return date.toString(QStringLiteral("yyyy-MM-dd HH:mm:ss ")) +
+           QLatin1Char(offset < 0 ? '-' : '+') +
+           QStringLiteral("%1%2")
+               .arg(magnitude / 60, 2, 10, QLatin1Char('0'))
+               .arg(magnitude % 60, 2, 10, QLatin1Char('0'));
 }

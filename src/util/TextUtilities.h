@@ -1,11 +1,13 @@
 #pragma once
 
 #include <QList>
+#include <QString>
 #include <QtGlobal>
 
 #include <cstdint>
 
 class CString256;
+class QDateTime;
 
 /** Reverses a C string in place; null is ignored. */
 void reverse(char* s);
@@ -47,6 +49,9 @@ void URLSafeEncode(char* out, unsigned char c);
  * trailing space; zero seconds replaces the text by "0 secs".
  */
 void ElapsedTimeMessage(uint32_t seconds, CString256& text);
+
+/** A date in the program's one textual form, local time: "2024-05-01 14:03:22 +0200". */
+QString DateDescription(const QDateTime& date);
 
 /**
  * Moves the element at from to index to, shifting those between by one. Out-of-range indexes

@@ -2,7 +2,9 @@
 
 #include "text/CString256.h"
 
+#include <QDateTime>
 #include <QStringList>
+#include <QTimeZone>
 #include <gtest/gtest.h>
 
 #include <climits>
@@ -170,3 +172,14 @@ TEST(TextUtilities, MoveArrayItem) {
 }
 
 } // namespace
+
+TEST(DateDescription, DateTimeAndNumericOffset) {
+    const QDate day(2024, 5, 1);
+    const QTime time(14, 3, 22);
+    EXPECT_EQ(DateDescription(QDateTime(day, time, QTimeZone(7200))),
+              QStringLiteral("2024-05-01 14:03:22 +0200"));
+    EXPECT_EQ(DateDescription(QDateTime(day, time, QTimeZone(-19800))),
+              QStringLiteral("2024-05-01 14:03:22 -0530"));
+    EXPECT_EQ(DateDescription(QDateTime(day, time, QTimeZone::utc())),
+              QStringLiteral("2024-05-01 14:03:22 +0000"));
+}

@@ -1,0 +1,76 @@
+#pragma once
+
+#include "addressbook/Group.h"
+#include "addressbook/ImportedContact.h"
+#include "addressbook/Person.h"
+
+#include <QList>
+#include <QString>
+#include <QVariant>
+
+#include <optional>
+
+class QSqlQuery;
+
+/** What one import changed. */
+struct ImportSummary {
+    int personsAdded = 0;
+    /** Contacts of the file that were already in the book (same names, same primary address). */
+    int personsKnown = 0;
+    /** Distinct groups the file named, new or not. */
+    int groups = 0;
+};
+
+/**
+ * The address book: persons (first name, last name, e-mail addresses of which one is primary)
+ * and named groups whose members keep the order in which they joined. Kept in an SQLite file;
+ * each object has a connection of its own, so several may be open on one file. Group names
+ * are unique ignoring letter case. Every failure of the database throws PelmoException
+ * ("AddressBookUnavailable") with the database's reason. Main thread only.
+ */
+class AddressBook {
+public:
+    /** Opens AddressBook.sqlite in the data folder, creating the folder and file when missing. */
+    AddressBook();
+    /** Opens (creating when missing) the database file at path. */
+    explicit AddressBook(const QString& path);
+    ~AddressBook();
+    AddressBook(const AddressBook&) = delete;
+    AddressBook& operator=(const AddressBook&) = delete;
+
+    const QString& path() const { return filePath; }
+
+    /** Every person, by last name, then first name. */
+    QList<Person> persons() const;
+    std::optional<Person> person(qint64 id) const;
+    /** Every group, by name. */
+    QList<Group> groups() const;
+    std::optional<Group> group(qint64 id) const;
+    /** The group of that name, ignoring letter case. */
+    std::optional<Group> groupNamed(const QString& name) const;
+    /** The group's members in order; nullopt when there is no such group. */
+    std::optional<QList<Person>> members(qint64 groupId) const;
+
+    /**
+     * Adds the contacts in one transaction: on any failure nothing of them is kept. A contact
+     * with the names and primary address (ignoring letter case) of a person already in the
+     * book is that person, who only joins the contact's groups. Missing groups are created;
+     * new members join at the end of a group.
+     */
+    ImportSummary add(const QList<ImportedContact>& contacts);
+
+private:
+    void open();
+    void createTables();
+    QSqlQuery prepared(const QString& sql) const;
+    void run(QSqlQuery& query) const;
+    QList<Person> loadPersons(const QString& personsSql, const QString& emailsSql,
+                              const QVariant& bound = {}) const;
+    qint64 insertPerson(const Person& person);
+    qint64 groupId(const QString& name);
+    void addMember(qint64 group, qint64 person);
+    [[noreturn]] void fail(const QString& detail) const;
+
+    QString filePath;
+    QString connectionName;
+};

@@ -1,0 +1,70 @@
+#include "controller/HtmlCharset.h"
+
+#include <QRegularExpression>
+#include <QStringDecoder>
+#include <QStringEncoder>
+#include <QTextDocument>
+
+HtmlCharset HtmlCharset::forIndex(int index) {
+    // The IANA names, which is what browsers and mail readers look for in HTML.
+    switch (index) {
+    case 1:
+        return HtmlCharset(QStringLiteral("us-ascii"));
+    case 2:
+        return HtmlCharset(QStringLiteral("iso-8859-1"));
+    case 3:
+        return HtmlCharset(QStringLiteral("Shift_JIS"));
+    default:
+        return HtmlCharset(QStringLiteral("utf-8"));
+    }
+}
+
+QByteArray HtmlCharset::exportDocument(const QTextDocument& document) const {
+    QString html = document.toHtml();
+    if (html.isEmpty())
+        return {};
+    static const QRegularExpression declared(QStringLiteral("<meta charset=\"[^\"]*\" */?>"));
+    const QString meta = QStringLiteral("<meta charset=\"%1\" />").arg(charsetName);
+    if (html.contains(declared))
+        html.replace(declared, meta);
+    else
+        html.replace(QStringLiteral("<head>"), QStringLiteral("<head>") + meta);
+    return encode(escapeUnencodable(html));
+}
+
+QString HtmlCharset::escapeUnencodable(const QString& text) const {
+    QString escaped;
+    escaped.reserve(text.size());
+    for (const char32_t codePoint : text.toUcs4()) {
+        if (canHold(codePoint))
+            escaped += QString::fromUcs4(&codePoint, 1);
+        else
+            escaped += QStringLiteral("&#%1;").arg(static_cast<uint>(codePoint));
+    }
+    return escaped;
+}
+
+QByteArray HtmlCharset::encode(const QString& text) const {
+    QStringEncoder encoder(charsetName.toLatin1().constData());
+    return encoder.encode(text);
+}
+
+QString HtmlCharset::decode(const QByteArray& bytes) const {
+    QStringDecoder decoder(charsetName.toLatin1().constData());
+    return decoder.decode(bytes);
+}
+
+bool HtmlCharset::canHold(char32_t codePoint) const {
+    if (codePoint < 0x80 || charsetName == QLatin1String("utf-8"))
+        return true;
+    if (charsetName == QLatin1String("us-ascii"))
+        return false;
+    if (charsetName == QLatin1String("iso-8859-1"))
+        return codePoint < 0x100;
+    // Shift_JIS: a character it holds survives the way there and back; this also refuses
+    // the characters a converter maps to a look-alike (the yen sign to the backslash byte).
+    const QString character = QString::fromUcs4(&codePoint, 1);
+    QStringEncoder encoder(charsetName.toLatin1().constData());
+    const QByteArray bytes = encoder.encode(character);
+    return !encoder.hasError() && decode(bytes) == character;
+}

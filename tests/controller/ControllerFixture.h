@@ -1,0 +1,47 @@
+#pragma once
+
+#include "RecordingView.h"
+#include "addressbook/AddressBook.h"
+#include "controller/PasswordStore.h"
+#include "controller/PelmoController.h"
+
+#include <QSettings>
+#include <QTemporaryDir>
+#include <gtest/gtest.h>
+
+#include <memory>
+
+// A keyring that answers what the test put in it and counts the questions.
+class FakeKeyring : public PasswordStore {
+public:
+    QString stored;
+    int reads = 0;
+    QString readPassword(const QString&) override { return ++reads, stored; }
+};
+
+// A controller over a recording view, a fresh SQLite address book and empty settings.
+class ControllerFixture : public ::testing::Test {
+protected:
+    void SetUp() override {
+        ASSERT_TRUE(folder.isValid());
+        settings().clear();
+        settings().sync();
+        book = std::make_unique<AddressBook>(folder.filePath(QStringLiteral("book.sqlite")));
+        controller = std::make_unique<PelmoController>(view, *book, keyring);
+    }
+
+    static QSettings& settings() {
+        static QSettings store(QStringLiteral("Orvale Software"), QStringLiteral("Pelmo"));
+        return store;
+    }
+    static void set(const char* key, const QVariant& value) {
+        settings().setValue(QLatin1String(key), value);
+        settings().sync();
+    }
+
+    QTemporaryDir folder;
+    RecordingView view;
+    FakeKeyring keyring;
+    std::unique_ptr<AddressBook> book;
+    std::unique_ptr<PelmoController> controller;
+};
