@@ -20,6 +20,8 @@ const std::vector<Command> kCommands = {
     {"contacts", contacts,
      "pelmo contacts import FILE          add a vCard (.vcf) or CSV file to the address book\n"
      "  pelmo contacts list [--group NAME]  list everyone, or the members of one group"},
+    {"send", send,
+     "pelmo send [options]                one mailing run without a window (pelmo send --help)"},
     {"relink", relink,
      "pelmo relink BASE-URL [FILE]        print FILE (or standard input) relinked against "
      "BASE-URL"},

@@ -24,4 +24,10 @@ int contacts(const QStringList& args);
 
 int relink(const QStringList& args);
 
+/**
+ * `send [options]`: one mailing run without a window, printing every status line. 0 when every
+ * copy was accepted, 1 when any was not (refused, login failed, run halted), 2 on a usage error.
+ */
+int send(const QStringList& args);
+
 } // namespace Commands

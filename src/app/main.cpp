@@ -1,9 +1,13 @@
 #include "app/Commands.h"
 
-#include <QCoreApplication>
+#include <QGuiApplication>
 
 int main(int argc, char** argv) {
-    QCoreApplication app(argc, argv);
+    // Commands run where there may be no display (cron, ssh); the message body still needs
+    // Qt's text layout, which the offscreen platform provides.
+    if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM"))
+        qputenv("QT_QPA_PLATFORM", "offscreen");
+    QGuiApplication app(argc, argv);
     QCoreApplication::setOrganizationName(QStringLiteral("Orvale Software"));
     QCoreApplication::setApplicationName(QStringLiteral("Pelmo"));
     QCoreApplication::setApplicationVersion(QStringLiteral(PELMO_VERSION));

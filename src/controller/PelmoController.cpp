@@ -3,10 +3,17 @@
 #include "addressbook/AddressBook.h"
 #include "controller/HtmlCharset.h"
 #include "controller/PasswordStore.h"
+#include "relink/Relink.h"
+#include "relink/SuffixMap.h"
+#include "relink/browser/FrontBrowser.h"
+#include "smtp/SMTP.h"
+#include "smtp/SmtpClient.h"
 #include "util/CLog.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
+#include "util/TextUtilities.h"
 
+#include <QDateTime>
 #include <QTextCursor>
 #include <QTextDocument>
 
@@ -56,6 +63,7 @@ void PelmoController::startUp() {
 }
 
 void PelmoController::applicationWillFinishLaunching() {
+    InitializeSuffixMap();
     StartLogging();
 }
 
@@ -65,9 +73,20 @@ void PelmoController::applicationWillTerminate() {
 
 // Settings
 
-QString PelmoController::stringSetting(const char* key) {
+QVariant PelmoController::setting(const char* key) {
+    const auto overridden = overrides.constFind(QLatin1String(key));
+    if (overridden != overrides.constEnd())
+        return overridden.value();
     defaults.sync();
-    const QVariant value = defaults.value(QLatin1String(key));
+    return defaults.value(QLatin1String(key));
+}
+
+void PelmoController::overrideSetting(const QString& key, const QVariant& value) {
+    overrides.insert(key, value);
+}
+
+QString PelmoController::stringSetting(const char* key) {
+    const QVariant value = setting(key);
     if (!value.isValid())
         return {};
     // A comma left unquoted in a hand-edited settings file makes QSettings read a list.
@@ -77,8 +96,7 @@ QString PelmoController::stringSetting(const char* key) {
 }
 
 int PelmoController::integerSetting(const char* key) {
-    defaults.sync();
-    return defaults.value(QLatin1String(key)).toInt();
+    return setting(key).toInt();
 }
 
 QString PelmoController::requiredSetting(const char* key, const char* failureName,
@@ -146,6 +164,11 @@ QString PelmoController::getUsername() {
 }
 
 QString PelmoController::getPassword() {
+    // A password given for this run wins over the keyring's.
+    if (overrides.contains(QStringLiteral("loginPassword")))
+        return requiredSetting("loginPassword", "NoPassword",
+                               "The outgoing SMTP server 'Password:' preference value has not "
+                               "been specified.");
     const QString fromKeyring = passwords.readPassword(QStringLiteral("loginPassword"));
     if (!fromKeyring.isEmpty())
         return fromKeyring;
@@ -175,8 +198,7 @@ int PelmoController::getSelectedLoginMechanism() {
 }
 
 bool PelmoController::useSSL() {
-    defaults.sync();
-    return defaults.value(QStringLiteral("useSSL")).toBool();
+    return setting("useSSL").toBool();
 }
 
 int PelmoController::completionAction() {
@@ -329,4 +351,129 @@ void PelmoController::abRecordSelected(const QList<qint64>& personIds,
 void PelmoController::textDidChange(PelmoView::Field field) {
     if (field == PelmoView::Field::To || field == PelmoView::Field::Name)
         people.reset();
+}
+
+// The mailing run
+
+void PelmoController::send() {
+    window.showRecipientsWindow();
+    webPageOrFileContents = getWebPageOrFile();
+    if (window.sendButtonTitle() != LocalizedStringNS("Send")) {
+        abort();
+        return;
+    }
+    window.setSendButtonTitle(LocalizedStringNS("Stop"));
+    stopSending = false;
+    statusMsg(LocalizedStringNS("Sending mail."));
+    defaults.sync();
+    const QPointer<SMTP> before = currentDelivery;
+    if (people) {
+        window.setProgressCounting(0.0, static_cast<double>(people->size()), 0.0);
+        sendMember();
+    } else {
+        window.setProgressBusy();
+        startDelivery();
+    }
+    // Nobody left to mail, or a person without an address: no delivery will report back.
+    if (currentDelivery == before)
+        Q_EMIT runIdle();
+}
+
+bool PelmoController::sendMember() {
+    if (stopSending)
+        return false;
+    if (!people || people->isEmpty()) {
+        endRun();
+        return false;
+    }
+    window.setProgressValue(window.progressMaximum() - static_cast<double>(people->size()) + 1.0);
+    const Person person = people->constFirst();
+    window.setName(firstAndLastName(person));
+    // A person without an address is taken off all the same: the run halts there, since the
+    // next person is only taken when a connection closes.
+    if (!person.emails.isEmpty()) {
+        window.setTo(person.primaryEmail());
+        startDelivery();
+    }
+    if (people && !people->isEmpty())
+        people->removeFirst();
+    return true;
+}
+
+void PelmoController::startDelivery() {
+    auto* delivery = new SMTP(*this);
+    currentDelivery = delivery;
+    connect(delivery, &SMTP::finished, this, [this, delivery](bool accepted) {
+        Q_EMIT deliveryFinished(accepted);
+        if (currentDelivery == delivery)
+            Q_EMIT runIdle();
+    });
+    delivery->sendMail();
+}
+
+void PelmoController::endRun() {
+    window.setProgressBusy();
+    window.startProgressAnimation();
+    window.stopProgressAnimation();
+    people.reset();
+    statusMsg(LocalizedStringNS("[Mailing completed at ") +
+              DateDescription(QDateTime::currentDateTime()) + QStringLiteral("]"));
+    window.setSendButtonTitle(LocalizedStringNS("Send"));
+    Q_EMIT runCompleted();
+}
+
+void PelmoController::abort() {
+    window.stopProgressAnimation();
+    stopSending = true;
+    window.setSendButtonTitle(LocalizedStringNS("Send"));
+}
+
+SmtpSession* PelmoController::createSession(const QString& host, int port) {
+    if (sessionFactory)
+        return sessionFactory(host, port);
+    // "smtpTimeout" (seconds) shortens the waits for slow links and for tests.
+    const int timeout = integerSetting("smtpTimeout");
+    return new SmtpClient(host, static_cast<quint16>(port),
+                          timeout > 0 ? std::chrono::seconds(timeout)
+                                      : SmtpClient::kDefaultTimeout);
+}
+
+void PelmoController::setSessionFactory(SessionFactory factory) {
+    sessionFactory = std::move(factory);
+}
+
+// The message source
+
+QString PelmoController::getWebPageOrFile() {
+    const QString typed = window.webPageOrFile();
+    if (typed.isNull())
+        return {};
+    const QString address = typed.toLower();
+    if (!address.startsWith(QLatin1String("http://")) &&
+        !address.startsWith(QLatin1String("https://")))
+        return {};
+    statusMsg(QStringLiteral("Downloading \"%1\"").arg(address));
+    // The whole address is fetched lower-cased; links are resolved against it as typed.
+    const QString page = DownloadURL(address);
+    if (page.isNull()) {
+        statusMsg(QStringLiteral("Could not download \"%1\"").arg(address));
+        return {};
+    }
+    const QByteArray base = typed.toUtf8();
+    const QByteArray bytes = page.toUtf8();
+    CText text("");
+    text.append(bytes.constData(), bytes.size());
+    statusMsg(QStringLiteral("Relinking web page..."));
+    relink(CString256(base.constData()), text);
+    return QString::fromUtf8(text.buffer(), text.length());
+}
+
+QString PelmoController::getWebPageOrFileContents() {
+    if (webPageOrFileContents.isNull())
+        return {};
+    return replaceTags(webPageOrFileContents);
+}
+
+void PelmoController::setAttachments(const QStringList& paths) {
+    attachments = paths;
 }

@@ -5,15 +5,20 @@
 
 #include <QList>
 #include <QObject>
+#include <QPointer>
 #include <QSet>
 #include <QSettings>
 #include <QString>
 #include <QStringList>
 #include <QVariant>
+#include <QVariantMap>
 
+#include <functional>
 #include <optional>
 
 class AddressBook;
+class SMTP;
+class SmtpSession;
 class PasswordStore;
 class QTextDocument;
 
@@ -47,6 +52,45 @@ public:
 
     /** The message body; owned by the controller, shared with the window's editor. */
     QTextDocument* message() const { return body; }
+    /** The window the controller drives. */
+    PelmoView& view() const { return window; }
+
+    /**
+     * Makes value stand for the setting key until the controller goes, without writing it to
+     * the settings file: one run from the command line with another server or port.
+     */
+    void overrideSetting(const QString& key, const QVariant& value);
+
+    // The mailing run. One delivery (an SMTP object) at a time: the next person's starts when
+    // the previous connection has closed.
+
+    /**
+     * The Send/Stop button: fetches the web page, then either stops the run (the button
+     * reads "Stop") or starts one, over the pending selection or to the To field.
+     */
+    void send();
+    /**
+     * Takes the next pending person, fills To and Name, and starts their delivery when they
+     * have an address. False when the run was stopped or no one is left (the run then ends).
+     */
+    bool sendMember();
+    /** Stops the run after the delivery in progress; the persons not yet mailed stay pending. */
+    void abort();
+    /** A new session for one delivery, made by the session factory. Owned by the caller. */
+    SmtpSession* createSession(const QString& host, int port);
+    using SessionFactory = std::function<SmtpSession*(const QString& host, int port)>;
+    /** Replaces how sessions are made (a dry run writes files; tests hand in their own). */
+    void setSessionFactory(SessionFactory factory);
+
+    // The message source.
+
+    /** The web page field's page, downloaded and relinked; null when there is none. */
+    QString getWebPageOrFile();
+    /** This run's page with the tags replaced for the current recipient; null without a page. */
+    QString getWebPageOrFileContents();
+    /** The files attached to every message, in order. */
+    const QStringList& getAttachments() const { return attachments; }
+    void setAttachments(const QStringList& paths);
 
     // Settings and fields. Every getter that reads a setting syncs the settings store first,
     // so a change saved by the preferences (or another process) is seen by the next call.
@@ -162,12 +206,21 @@ public Q_SLOTS:
 Q_SIGNALS:
     /** The sent-recipients list changed. */
     void recipientsChanged();
+    /** The run reached its end: every pending person was taken. */
+    void runCompleted();
+    /** One delivery will start nothing more; accepted when the server took its message. */
+    void deliveryFinished(bool accepted);
+    /** Nothing is in progress any more: the run is over, stopped or halted. */
+    void runIdle();
 
 private:
     QString requiredSetting(const char* key, const char* failureName, const char* reason);
     QString stringSetting(const char* key);
     int integerSetting(const char* key);
+    QVariant setting(const char* key);
     void recipientsDidChange();
+    void startDelivery();
+    void endRun();
 
     PelmoView& window;
     AddressBook& addressBook;
@@ -178,4 +231,11 @@ private:
     QStringList recipients;
     /** recipients case-folded, so that recipientsContains need not walk the list. */
     QSet<QString> foldedRecipients;
+    QVariantMap overrides;
+    bool stopSending = false;
+    QString webPageOrFileContents;
+    QStringList attachments;
+    SessionFactory sessionFactory;
+    /** The latest delivery started; a finished one that is still the latest leaves the run idle. */
+    QPointer<SMTP> currentDelivery;
 };

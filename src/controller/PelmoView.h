@@ -24,6 +24,9 @@ public:
     virtual QString name() const = 0;
     virtual void setName(const QString& text) = 0;
 
+    /** The web page field: the address of a page to mail with every copy. */
+    virtual QString webPageOrFile() const = 0;
+    virtual void setWebPageOrFile(const QString& text) = 0;
     /** Replaces the one-line status display. */
     virtual void setStatus(const QString& text) = 0;
 

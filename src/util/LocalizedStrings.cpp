@@ -33,3 +33,19 @@ QString LocalizedString(const char* key) {
 QString LocalizedStringNS(const char* key) {
     return LocalizedString(key);
 }
+
+QString LocalizedFormat(const char* key, const QStringList& arguments) {
+    const QString format = LocalizedString(key);
+    QString text;
+    qsizetype from = 0;
+    for (const QString& argument : arguments) {
+        const qsizetype at = format.indexOf(QLatin1String("%@"), from);
+        if (at < 0)
+            break;
+        text += QStringView(format).mid(from, at - from);
+        text += argument;
+        from = at + 2;
+    }
+    text += QStringView(format).mid(from);
+    return text;
+}

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <QString>
+#include <QStringList>
 
 /**
  * Every user-visible text is looked up here by its English text in the Qt translation context
@@ -15,3 +16,6 @@ QString LocalizedString(const char* key);
 
 /** The same lookup, for window code. */
 QString LocalizedStringNS(const char* key);
+
+/** The localized key used as a format: each "%@" in turn takes the next argument. */
+QString LocalizedFormat(const char* key, const QStringList& arguments);

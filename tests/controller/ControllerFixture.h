@@ -10,6 +10,12 @@
 #include <gtest/gtest.h>
 
 #include <memory>
+#include <ostream>
+
+// Failures show text, not UTF-16 code units.
+inline void PrintTo(const QString& text, std::ostream* out) {
+    *out << '"' << text.toStdString() << '"';
+}
 
 // A keyring that answers what the test put in it and counts the questions.
 class FakeKeyring : public PasswordStore {

@@ -7,12 +7,13 @@
 // A view that keeps what the controller shows and counts how often each field is read.
 class RecordingView : public PelmoView {
 public:
-    QString subjectText, toText, nameText, buttonTitle = QStringLiteral("Send");
+    QString subjectText, toText, nameText, pageText, buttonTitle = QStringLiteral("Send");
     QStringList statuses;
     QStringList events; // beeps and alerts in order
     mutable int subjectReads = 0, toReads = 0, nameReads = 0;
     int reloads = 0;
     double minimum = 0, maximum = 0, value = 0;
+    QList<double> values; // every progress value set, in order
     bool busy = false, animating = false;
 
     QString subject() const override { return ++subjectReads, subjectText; }
@@ -21,12 +22,14 @@ public:
     void setTo(const QString& text) override { toText = text; }
     QString name() const override { return ++nameReads, nameText; }
     void setName(const QString& text) override { nameText = text; }
+    QString webPageOrFile() const override { return pageText; }
+    void setWebPageOrFile(const QString& text) override { pageText = text; }
     void setStatus(const QString& text) override { statuses << text; }
     void setProgressCounting(double min, double max, double val) override {
         busy = false, minimum = min, maximum = max, value = val;
     }
     void setProgressBusy() override { busy = true; }
-    void setProgressValue(double val) override { value = val; }
+    void setProgressValue(double val) override { values << (value = val); }
     double progressMaximum() const override { return maximum; }
     void startProgressAnimation() override { animating = true; }
     void stopProgressAnimation() override { animating = false; }

@@ -1,0 +1,215 @@
+#include "app/Commands.h"
+
+#include "addressbook/AddressBook.h"
+#include "app/ConsoleView.h"
+#include "controller/PasswordStore.h"
+#include "controller/PelmoController.h"
+#include "smtp/DryRunSession.h"
+#include "util/PelmoException.h"
+
+#include <QCoreApplication>
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+#include <QTextDocument>
+#include <QTextStream>
+
+namespace Commands {
+
+namespace {
+
+constexpr char kUsage[] =
+    "usage: pelmo send [--group NAME | --to ADDRESS [--name NAME]] [--subject TEXT]\n"
+    "                  [--message FILE] [--page URL] [--attach FILE]... [--set KEY=VALUE]...\n"
+    "                  [--dry-run DIR]\n";
+
+// The settings a run may override; anything else is most likely a typing mistake.
+const QStringList kSettingKeys = {
+    QStringLiteral("senderEmail"),
+    QStringLiteral("senderName"),
+    QStringLiteral("defaultRecipientEmail"),
+    QStringLiteral("defaultRecipientName"),
+    QStringLiteral("selectedContentType"),
+    QStringLiteral("selectedCharacterSet"),
+    QStringLiteral("selectedAuthentication"),
+    QStringLiteral("useSSL"),
+    QStringLiteral("serverAddress"),
+    QStringLiteral("serverPort"),
+    QStringLiteral("completionAction"),
+    QStringLiteral("loginUsername"),
+    QStringLiteral("loginPassword"),
+    QStringLiteral("smtpTimeout"),
+};
+
+struct SendOptions {
+    QString group, to, name, subject, messageFile, page, dryRunDirectory;
+    bool hasTo = false, hasName = false;
+    QStringList attachments;
+    QList<QPair<QString, QString>> settings;
+};
+
+class UsageError {
+public:
+    explicit UsageError(QString text) : message(std::move(text)) {}
+    QString message;
+};
+
+QString valueAfter(const QStringList& args, qsizetype& i) {
+    if (i + 1 >= args.size())
+        throw UsageError(QStringLiteral("%1 needs a value").arg(args.at(i)));
+    return args.at(++i);
+}
+
+SendOptions parse(const QStringList& args) {
+    SendOptions options;
+    for (qsizetype i = 0; i < args.size(); ++i) {
+        const QString& option = args.at(i);
+        if (option == QLatin1String("--group")) {
+            options.group = valueAfter(args, i);
+        } else if (option == QLatin1String("--to")) {
+            options.to = valueAfter(args, i);
+            options.hasTo = true;
+        } else if (option == QLatin1String("--name")) {
+            options.name = valueAfter(args, i);
+            options.hasName = true;
+        } else if (option == QLatin1String("--subject")) {
+            options.subject = valueAfter(args, i);
+        } else if (option == QLatin1String("--message")) {
+            options.messageFile = valueAfter(args, i);
+        } else if (option == QLatin1String("--page")) {
+            options.page = valueAfter(args, i);
+        } else if (option == QLatin1String("--attach")) {
+            options.attachments << valueAfter(args, i);
+        } else if (option == QLatin1String("--dry-run")) {
+            options.dryRunDirectory = valueAfter(args, i);
+        } else if (option == QLatin1String("--set")) {
+            const QString pair = valueAfter(args, i);
+            const qsizetype equals = pair.indexOf(QLatin1Char('='));
+            const QString key = pair.left(equals);
+            if (equals <= 0 || !kSettingKeys.contains(key))
+                throw UsageError(QStringLiteral("--set takes KEY=VALUE with KEY one of: %1")
+                                     .arg(kSettingKeys.join(QStringLiteral(", "))));
+            options.settings.append({key, pair.mid(equals + 1)});
+        } else {
+            throw UsageError(QStringLiteral("unknown option %1").arg(option));
+        }
+    }
+    if (!options.group.isEmpty() && (options.hasTo || options.hasName))
+        throw UsageError(QStringLiteral("--group and --to/--name cannot be used together"));
+    return options;
+}
+
+// What can be checked before anything is sent; the reason, or a null string.
+QString problemWith(const SendOptions& options) {
+    if (!options.messageFile.isEmpty() && !QFileInfo(options.messageFile).isReadable())
+        return QStringLiteral("cannot read the message file %1").arg(options.messageFile);
+    for (const QString& path : options.attachments) {
+        const QFileInfo file(path);
+        if (!file.isFile() || !file.isReadable())
+            return QStringLiteral("cannot read the attachment %1").arg(path);
+    }
+    if (!options.dryRunDirectory.isEmpty() && !QDir().mkpath(options.dryRunDirectory))
+        return QStringLiteral("cannot create the folder %1").arg(options.dryRunDirectory);
+    return {};
+}
+
+void loadMessage(const QString& path, QTextDocument& body) {
+    QFile file(path);
+    if (!file.open(QIODevice::ReadOnly))
+        return;
+    const QString text = QString::fromUtf8(file.readAll());
+    const QString suffix = QFileInfo(path).suffix().toLower();
+    if (suffix == QLatin1String("html") || suffix == QLatin1String("htm"))
+        body.setHtml(text);
+    else
+        body.setPlainText(text);
+}
+
+void writeCopiesTo(PelmoController& controller, const QString& directory) {
+    auto copies = std::make_shared<int>(0);
+    controller.setSessionFactory([directory, copies](const QString&, int) -> SmtpSession* {
+        const QString name = QStringLiteral("%1.eml").arg(++*copies, 4, 10, QLatin1Char('0'));
+        return new DryRunSession(QDir(directory).filePath(name));
+    });
+}
+
+// Puts the options into the controller as a user would into the window.
+bool prepare(PelmoController& controller, AddressBook& book, const SendOptions& options) {
+    PelmoView& view = controller.view();
+    for (const auto& [key, value] : options.settings)
+        controller.overrideSetting(key, value);
+    if (options.hasTo)
+        view.setTo(options.to);
+    if (options.hasName)
+        view.setName(options.name);
+    view.setSubject(options.subject);
+    view.setWebPageOrFile(options.page);
+    if (!options.messageFile.isEmpty())
+        loadMessage(options.messageFile, *controller.message());
+    QStringList paths;
+    for (const QString& path : options.attachments)
+        paths << QFileInfo(path).absoluteFilePath();
+    controller.setAttachments(paths);
+    if (!options.dryRunDirectory.isEmpty())
+        writeCopiesTo(controller, options.dryRunDirectory);
+    if (options.group.isEmpty())
+        return true;
+    const std::optional<Group> group = book.groupNamed(options.group);
+    if (!group) {
+        QTextStream(stderr) << "pelmo: the address book has no group \"" << options.group << "\"\n";
+        return false;
+    }
+    controller.abGroupSelected({group->id}, true);
+    return true;
+}
+
+int runMailing(PelmoController& controller) {
+    bool completed = false;
+    int refused = 0;
+    QObject::connect(&controller, &PelmoController::runCompleted,
+                     [&completed] { completed = true; });
+    QObject::connect(&controller, &PelmoController::deliveryFinished, [&refused](bool accepted) {
+        if (!accepted)
+            ++refused;
+    });
+    QObject::connect(&controller, &PelmoController::runIdle, [] { QCoreApplication::exit(0); });
+    QMetaObject::invokeMethod(&controller, &PelmoController::send, Qt::QueuedConnection);
+    QCoreApplication::exec();
+    return completed && refused == 0 ? 0 : 1;
+}
+
+} // namespace
+
+int send(const QStringList& args) {
+    if (args.contains(QLatin1String("--help"))) {
+        QTextStream(stdout) << kUsage;
+        return 0;
+    }
+    SendOptions options;
+    try {
+        options = parse(args);
+    } catch (const UsageError& error) {
+        QTextStream(stderr) << "pelmo send: " << error.message << '\n' << kUsage;
+        return 2;
+    }
+    if (const QString problem = problemWith(options); !problem.isNull()) {
+        QTextStream(stderr) << "pelmo send: " << problem << '\n';
+        return 1;
+    }
+    try {
+        ConsoleView view;
+        AddressBook book;
+        PasswordStore passwords;
+        PelmoController controller(view, book, passwords);
+        controller.startUp();
+        controller.applicationWillFinishLaunching();
+        const int status = prepare(controller, book, options) ? runMailing(controller) : 1;
+        controller.applicationWillTerminate();
+        return status;
+    } catch (const PelmoException& failure) {
+        QTextStream(stderr) << "pelmo send: " << failure.reason() << '\n';
+        return 1;
+    }
+}
+
+} // namespace Commands

@@ -1,0 +1,99 @@
+#include "relink/browser/FrontBrowser.h"
+
+#include <QEventLoop>
+#include <QNetworkAccessManager>
+#include <QNetworkReply>
+#include <QNetworkRequest>
+#include <QRegularExpression>
+#include <QStringDecoder>
+#include <QUrl>
+
+#include <iconv.h>
+
+#include <memory>
+
+namespace {
+
+// Whole-text conversion through iconv; null when the charset is unknown or a byte is invalid.
+QString convert(const QByteArray& bytes, const QByteArray& charset) {
+    iconv_t cd = iconv_open("UTF-8", charset.constData());
+    if (cd == reinterpret_cast<iconv_t>(-1))
+        return {};
+    std::unique_ptr<void, int (*)(iconv_t)> closer(cd, iconv_close);
+    QByteArray out(bytes.size() * 4 + 4, Qt::Uninitialized);
+    char* in = const_cast<char*>(bytes.constData());
+    size_t inLeft = static_cast<size_t>(bytes.size());
+    char* outPtr = out.data();
+    size_t outLeft = static_cast<size_t>(out.size());
+    if (iconv(cd, &in, &inLeft, &outPtr, &outLeft) == static_cast<size_t>(-1))
+        return {};
+    out.truncate(out.size() - static_cast<qsizetype>(outLeft));
+    return QString::fromUtf8(out);
+}
+
+QString strictUtf8(const QByteArray& bytes) {
+    QStringDecoder decoder(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless);
+    const QString text = decoder.decode(bytes);
+    return decoder.hasError() ? QString() : text;
+}
+
+// The charset named by the Content-Type header, else by the page's own meta element.
+QByteArray declaredCharset(const QNetworkReply& reply, const QByteArray& bytes) {
+    static const QRegularExpression charset(
+        QStringLiteral(R"(charset\s*=\s*["']?([A-Za-z0-9._:-]+))"),
+        QRegularExpression::CaseInsensitiveOption);
+    const QString header = reply.header(QNetworkRequest::ContentTypeHeader).toString();
+    QRegularExpressionMatch match = charset.match(header);
+    if (!match.hasMatch())
+        match = charset.match(QString::fromLatin1(bytes.left(4096)));
+    return match.hasMatch() ? match.captured(1).toLatin1() : QByteArray();
+}
+
+QString decodePage(const QNetworkReply& reply, const QByteArray& bytes) {
+    QString text = strictUtf8(bytes);
+    if (text.isNull()) {
+        const QByteArray declared = declaredCharset(reply, bytes);
+        if (!declared.isEmpty())
+            text = convert(bytes, declared);
+    }
+    if (text.isNull())
+        text = convert(bytes, "MACINTOSH");
+    return text;
+}
+
+} // namespace
+
+QString DownloadURL(const QString& url, std::chrono::milliseconds timeout, QString* error) {
+    const QUrl address(url, QUrl::StrictMode);
+    if (!address.isValid() || address.scheme().isEmpty()) {
+        if (error != nullptr)
+            *error = QStringLiteral("not a valid address");
+        return {};
+    }
+    QNetworkAccessManager network;
+    QNetworkRequest request(address);
+    request.setAttribute(QNetworkRequest::RedirectPolicyAttribute,
+                         QNetworkRequest::NoLessSafeRedirectPolicy);
+    request.setAttribute(QNetworkRequest::CacheLoadControlAttribute,
+                         QNetworkRequest::AlwaysNetwork);
+    request.setTransferTimeout(static_cast<int>(timeout.count()));
+    std::unique_ptr<QNetworkReply> reply(network.get(request));
+    QEventLoop loop;
+    QObject::connect(reply.get(), &QNetworkReply::finished, &loop, &QEventLoop::quit);
+    loop.exec(QEventLoop::ExcludeUserInputEvents);
+    if (reply->error() != QNetworkReply::NoError) {
+        if (error != nullptr)
+            *error = reply->errorString();
+        return {};
+    }
+    const QByteArray bytes = reply->readAll();
+    if (bytes.isEmpty()) {
+        if (error != nullptr)
+            *error = QStringLiteral("the page is empty");
+        return {};
+    }
+    const QString text = decodePage(*reply, bytes);
+    if (text.isNull() && error != nullptr)
+        *error = QStringLiteral("the page's characters cannot be read");
+    return text;
+}
