@@ -37,6 +37,7 @@ bench: deps
 	cmake -S . -B $(BUILD_BENCH) -G Ninja -DCMAKE_BUILD_TYPE=Release -DPELMO_BUILD_TESTS=OFF -DPELMO_BUILD_BENCH=ON
 	cmake --build $(BUILD_BENCH) -j $(JOBS)
 	@for b in $(BUILD_BENCH)/bench/*_bench; do echo "== $$b"; "$$b" || exit 1; done
+	@echo "== scripts/bench-send.sh"; bash scripts/bench-send.sh $(BUILD_BENCH)/src/pelmo
 
 clean:
 	rm -rf build

@@ -8,6 +8,7 @@ packages=(
   qt6-base-dev libqt6sql6-sqlite qtkeychain-qt6-dev
   libgtest-dev libgmock-dev libbenchmark-dev
   clang libclang-rt-14-dev
+  postfix
 )
 
 missing=()
@@ -25,5 +26,11 @@ fi
 
 echo "install-deps: installing ${missing[*]}"
 export DEBIAN_FRONTEND=noninteractive
+# Postfix is here for its smtp-sink and smtp-source benchmark tools: configured for local
+# mail only, it never takes mail from the network.
+if [[ " ${missing[*]} " == *" postfix "* ]]; then
+  printf '%s\n' "postfix postfix/main_mailer_type select Local only" \
+    "postfix postfix/mailname string localhost" | $sudo debconf-set-selections
+fi
 $sudo apt-get update -qq
 $sudo apt-get install -y -qq --no-install-recommends "${missing[@]}" >/dev/null
