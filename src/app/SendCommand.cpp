@@ -2,6 +2,7 @@
 
 #include "addressbook/AddressBook.h"
 #include "app/ConsoleView.h"
+#include "attachments/AttachmentsController.h"
 #include "controller/PasswordStore.h"
 #include "controller/PelmoController.h"
 #include "smtp/DryRunSession.h"
@@ -149,7 +150,7 @@ bool prepare(PelmoController& controller, AddressBook& book, const SendOptions& 
     QStringList paths;
     for (const QString& path : options.attachments)
         paths << QFileInfo(path).absoluteFilePath();
-    controller.setAttachments(paths);
+    controller.getAttachments().addFiles(paths);
     if (!options.dryRunDirectory.isEmpty())
         writeCopiesTo(controller, options.dryRunDirectory);
     if (options.group.isEmpty())

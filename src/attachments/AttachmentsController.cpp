@@ -132,3 +132,10 @@ bool AttachmentsController::openAttachment(int row) const {
         return false;
     return QDesktopServices::openUrl(QUrl::fromLocalFile(paths.at(row)));
 }
+
+void AttachmentsController::addFiles(const QStringList& files) {
+    if (files.isEmpty())
+        return;
+    paths.append(files);
+    Q_EMIT attachmentsChanged();
+}

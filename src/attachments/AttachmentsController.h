@@ -63,6 +63,8 @@ public:
      */
     bool acceptDrop(const Drag& drag, int row);
 
+    /** Appends files in the order given (files named on the command line or chosen in a dialog). */
+    void addFiles(const QStringList& files);
     /** Removes the selected rows; with no selection, removes every path. */
     void deleteButtonClicked(const QList<int>& selectedRows);
 

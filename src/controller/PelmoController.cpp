@@ -1,6 +1,7 @@
 #include "controller/PelmoController.h"
 
 #include "addressbook/AddressBook.h"
+#include "attachments/AttachmentsController.h"
 #include "controller/HtmlCharset.h"
 #include "controller/PasswordStore.h"
 #include "relink/Relink.h"
@@ -45,7 +46,7 @@ PelmoController::PelmoController(PelmoView& view, AddressBook& book, PasswordSto
                                  QObject* parent)
     : QObject(parent), window(view), addressBook(book), passwords(store),
       defaults(QStringLiteral("Orvale Software"), QStringLiteral("Pelmo")),
-      body(new QTextDocument(this)) {}
+      body(new QTextDocument(this)), attachments(new AttachmentsController(this)) {}
 
 PelmoController::~PelmoController() = default;
 
@@ -472,8 +473,4 @@ QString PelmoController::getWebPageOrFileContents() {
     if (webPageOrFileContents.isNull())
         return {};
     return replaceTags(webPageOrFileContents);
-}
-
-void PelmoController::setAttachments(const QStringList& paths) {
-    attachments = paths;
 }

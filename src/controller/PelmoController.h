@@ -17,6 +17,7 @@
 #include <optional>
 
 class AddressBook;
+class AttachmentsController;
 class SMTP;
 class SmtpSession;
 class PasswordStore;
@@ -88,9 +89,8 @@ public:
     QString getWebPageOrFile();
     /** This run's page with the tags replaced for the current recipient; null without a page. */
     QString getWebPageOrFileContents();
-    /** The files attached to every message, in order. */
-    const QStringList& getAttachments() const { return attachments; }
-    void setAttachments(const QStringList& paths);
+    /** The list of files attached to every message; owned by the controller. */
+    AttachmentsController& getAttachments() const { return *attachments; }
 
     // Settings and fields. Every getter that reads a setting syncs the settings store first,
     // so a change saved by the preferences (or another process) is seen by the next call.
@@ -234,7 +234,7 @@ private:
     QVariantMap overrides;
     bool stopSending = false;
     QString webPageOrFileContents;
-    QStringList attachments;
+    AttachmentsController* attachments;
     SessionFactory sessionFactory;
     /** The latest delivery started; a finished one that is still the latest leaves the run idle. */
     QPointer<SMTP> currentDelivery;

@@ -1,5 +1,6 @@
 #include "smtp/SMTP.h"
 
+#include "attachments/AttachmentsController.h"
 #include "controller/PelmoController.h"
 #include "smtp/MessageAssembly.h"
 #include "smtp/SmtpSession.h"
@@ -117,7 +118,7 @@ void SMTP::buildMessage() {
     if (!page.isNull())
         createMessageBodyPart(page, QStringLiteral("text/html"));
     // A file that has gone or cannot be read is left out without a word.
-    for (const QString& path : m_controller.getAttachments())
+    for (const QString& path : m_controller.getAttachments().getAttachments())
         m_message->addAttachment(path);
 }
 
