@@ -8,6 +8,7 @@ packages=(
   qt6-base-dev libqt6sql6-sqlite qtkeychain-qt6-dev
   libgtest-dev libgmock-dev libbenchmark-dev
   clang libclang-rt-14-dev
+  python3-aiosmtpd openssl
 )
 
 missing=()
