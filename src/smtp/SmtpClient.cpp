@@ -474,13 +474,7 @@ void SmtpClient::handleReply(int code) {
         return onDataEnd(code);
     case State::Quit:
         return onQuit(code);
-    case State::Ready: // unasked, such as a 421 before the server closes: kept as lastResponse
-    case State::Unconnected:
-    case State::Connecting:
-    case State::AwaitingSSL:
-    case State::SSLHandshake:
-    case State::TLSHandshake:
-    case State::Closed:
+    default: // Ready: unasked, such as a 421 before the server closes; kept as lastResponse
         return;
     }
 }

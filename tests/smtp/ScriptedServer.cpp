@@ -10,6 +10,15 @@ ScriptedServer::ScriptedServer() {
     connect(&m_server, &QTcpServer::newConnection, this, &ScriptedServer::onConnection);
 }
 
+void ScriptedServer::answer(const QByteArray& prefix, const QByteArray& text) {
+    responder = [prefix, text](ScriptedServer& server, const QByteArray& line) {
+        if (!line.startsWith(prefix))
+            return false;
+        server.reply(text);
+        return true;
+    };
+}
+
 void ScriptedServer::reply(const QByteArray& text) {
     if (pieceSize <= 0) {
         m_client->write(text);

@@ -32,6 +32,8 @@ public:
     /** Writes each reply in pieces of this many bytes, one event-loop turn apart (0: whole). */
     qsizetype pieceSize = 0;
 
+    /** Answers the command lines starting with `prefix` with `text` instead of the standard. */
+    void answer(const QByteArray& prefix, const QByteArray& text);
     void reply(const QByteArray& text);
     void standardReply(const QByteArray& line);
     /** Closes the connection once what was written whole has gone out. */

@@ -23,7 +23,7 @@ const std::pair<const char*, Signal> sessionSignals[] = {
 
 } // namespace
 
-SignalRecorder::SignalRecorder(SmtpSession& session) {
+SignalRecorder::SignalRecorder(SmtpSession& session) : m_session(session) {
     for (const auto& [name, signal] : sessionSignals) {
         const QString text = QString::fromLatin1(name);
         connect(&session, signal, this, [this, text] {
@@ -34,13 +34,16 @@ SignalRecorder::SignalRecorder(SmtpSession& session) {
     }
 }
 
-bool SignalRecorder::waitFor(const QString& name, qsizetype occurrences,
-                             std::chrono::milliseconds guard) {
-    const QDeadlineTimer deadline(guard);
+::testing::AssertionResult SignalRecorder::arrived(const char* name, qsizetype occurrences) {
+    const QString awaited = QString::fromLatin1(name);
+    const QDeadlineTimer deadline(std::chrono::seconds(20));
     const qsizetype before = m_names.size();
-    while (!settled(name, occurrences, before) && !deadline.hasExpired())
+    while (!settled(awaited, occurrences, before) && !deadline.hasExpired())
         QCoreApplication::processEvents(QEventLoop::WaitForMoreEvents, 50);
-    return count(name) >= occurrences;
+    if (count(awaited) >= occurrences)
+        return ::testing::AssertionSuccess();
+    return ::testing::AssertionFailure() << "no " << name << "; signals: " << joined().toStdString()
+                                         << "; error: " << m_session.errorString().toStdString();
 }
 
 void SignalRecorder::settle() {

@@ -4,8 +4,8 @@
 
 #include <QObject>
 #include <QStringList>
+#include <gtest/gtest.h>
 
-#include <chrono>
 #include <functional>
 
 /**
@@ -22,10 +22,10 @@ public:
 
     /**
      * Runs the event loop until `name` has arrived `occurrences` times, a failure or the end
-     * came instead, or the guard against hangs has passed; true when it arrived.
+     * came instead, or a guard against hangs has passed; a failure names what came instead
+     * and the session's errorString().
      */
-    bool waitFor(const QString& name, qsizetype occurrences = 1,
-                 std::chrono::milliseconds guard = std::chrono::seconds(20));
+    ::testing::AssertionResult arrived(const char* name, qsizetype occurrences = 1);
     /** Runs the event loop a little, so that any signal still queued would be recorded. */
     void settle();
 
@@ -34,5 +34,6 @@ public:
 private:
     bool settled(const QString& awaited, qsizetype occurrences, qsizetype before) const;
 
+    const SmtpSession& m_session;
     QStringList m_names;
 };

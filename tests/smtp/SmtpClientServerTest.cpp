@@ -83,27 +83,19 @@ protected:
         return ::testing::AssertionSuccess();
     }
 
-    ::testing::AssertionResult waitFor(const char* name, qsizetype occurrences = 1) {
-        if (recorder->waitFor(QString::fromLatin1(name), occurrences))
-            return ::testing::AssertionSuccess();
-        return ::testing::AssertionFailure()
-               << "no " << name << "; signals: " << recorder->joined().toStdString()
-               << "; error: " << client->errorString().toStdString();
-    }
-
     // Connects and goes as far as the service on the wanted transport, as the driver does.
     ::testing::AssertionResult serviceUp(Transport transport) {
         client->connectInBackgroundAndNotify();
-        if (auto established = waitFor("connectionEstablished"); !established)
+        if (auto established = recorder->arrived("connectionEstablished"); !established)
             return established;
         if (transport == Transport::Implicit)
             client->startSSL();
-        if (auto initialized = waitFor("serviceInitialized"); !initialized)
+        if (auto initialized = recorder->arrived("serviceInitialized"); !initialized)
             return initialized;
         if (transport != Transport::StartTLS)
             return ::testing::AssertionSuccess();
         client->startTLS();
-        return waitFor("serviceInitialized", 2);
+        return recorder->arrived("serviceInitialized", 2);
     }
 
     ScopedEnvironment trustFile{"SSL_CERT_FILE", pki().caCertificate()};
@@ -131,12 +123,12 @@ TEST_P(AuthenticatedSendTest, MessageArrivesWhole) {
     EXPECT_TRUE(client->supportedMechanisms().contains(row.mechanism));
 
     client->authenticate(QStringLiteral("user"), password, row.mechanism);
-    ASSERT_TRUE(waitFor("authenticationCompleted"));
+    ASSERT_TRUE(recorder->arrived("authenticationCompleted"));
     client->sendMessage();
-    ASSERT_TRUE(waitFor("messageSent"));
+    ASSERT_TRUE(recorder->arrived("messageSent"));
     EXPECT_TRUE(client->lastResponse().startsWith("250 2.0.0 Message accepted"));
     client->close();
-    ASSERT_TRUE(waitFor("connectionTerminated"));
+    ASSERT_TRUE(recorder->arrived("connectionTerminated"));
 
     const auto received = server->nextMessage();
     ASSERT_TRUE(received.has_value());
@@ -169,12 +161,12 @@ TEST_P(WrongPasswordTest, FailsWithoutShowingThePassword) {
     ASSERT_TRUE(start(row.transport));
     ASSERT_TRUE(serviceUp(row.transport));
     client->authenticate(QStringLiteral("user"), QStringLiteral("wrong-pa55"), row.mechanism);
-    ASSERT_TRUE(waitFor("authenticationFailed"));
+    ASSERT_TRUE(recorder->arrived("authenticationFailed"));
     EXPECT_TRUE(client->lastResponse().startsWith("535 "));
     EXPECT_TRUE(client->errorString().contains(QStringLiteral("535")));
     EXPECT_FALSE(client->errorString().contains(QStringLiteral("wrong-pa55")));
     client->close();
-    ASSERT_TRUE(waitFor("connectionTerminated"));
+    ASSERT_TRUE(recorder->arrived("connectionTerminated"));
     EXPECT_TRUE(server->stopAndCheckIdle());
 }
 
@@ -188,20 +180,20 @@ INSTANTIATE_TEST_SUITE_P(
 TEST_F(SmtpClientServerTest, StartTlsForgetsWhatWasAnnouncedInTheClear) {
     ASSERT_TRUE(start(Transport::StartTLS, {QStringLiteral("--require-starttls")}));
     client->connectInBackgroundAndNotify();
-    ASSERT_TRUE(waitFor("serviceInitialized"));
+    ASSERT_TRUE(recorder->arrived("serviceInitialized"));
     EXPECT_FALSE(client->isSSL());
     // This server offers AUTH only over TLS, so only a second EHLO can reveal it.
     EXPECT_TRUE(client->supportedMechanisms().isEmpty());
 
     client->startTLS();
-    ASSERT_TRUE(waitFor("serviceInitialized", 2));
+    ASSERT_TRUE(recorder->arrived("serviceInitialized", 2));
     EXPECT_TRUE(client->isSSL());
     EXPECT_EQ(client->supportedMechanisms(),
               QStringList(
                   {QStringLiteral("CRAM-MD5"), QStringLiteral("LOGIN"), QStringLiteral("PLAIN")}));
     // A server requiring STARTTLS takes mail only after it.
     client->sendMessage();
-    ASSERT_TRUE(waitFor("messageSent"));
+    ASSERT_TRUE(recorder->arrived("messageSent"));
     EXPECT_TRUE(server->nextMessage().has_value());
 }
 
@@ -212,18 +204,18 @@ TEST_F(SmtpClientServerTest, RefusedRecipientStopsTheMessage) {
                        {QStringLiteral("rcpt@example.org"), QStringLiteral("gone@example.org")});
     ASSERT_TRUE(serviceUp(Transport::Plain));
     client->sendMessage();
-    ASSERT_TRUE(waitFor("messageNotSent"));
+    ASSERT_TRUE(recorder->arrived("messageNotSent"));
     EXPECT_EQ(client->lastResponse(),
               "550 5.1.1 <gone@example.org>: Recipient address rejected\r\n");
     client->close();
-    ASSERT_TRUE(waitFor("connectionTerminated"));
+    ASSERT_TRUE(recorder->arrived("connectionTerminated"));
     EXPECT_TRUE(server->stopAndCheckIdle());
 }
 
 TEST_F(SmtpClientServerTest, ImplicitTlsWaitsForStartSslUntilTheTimeout) {
     ASSERT_TRUE(start(Transport::Implicit, {}, 1s));
     client->connectInBackgroundAndNotify();
-    ASSERT_TRUE(waitFor("connectionTimedOut"));
+    ASSERT_TRUE(recorder->arrived("connectionTimedOut"));
     EXPECT_EQ(recorder->joined(), QStringLiteral("connectionEstablished,connectionTimedOut"));
 }
 
@@ -242,14 +234,14 @@ TEST_P(FailedHandshakeTest, EndsLikeATimeoutWithTheReason) {
     ScopedEnvironment trust("SSL_CERT_FILE", row.trustTheCa ? pki().caCertificate() : QString());
     ASSERT_TRUE(start(row.transport, {}, 10s, row.certificate));
     client->connectInBackgroundAndNotify();
-    ASSERT_TRUE(waitFor("connectionEstablished"));
+    ASSERT_TRUE(recorder->arrived("connectionEstablished"));
     if (row.transport == Transport::Implicit) {
         client->startSSL();
     } else {
-        ASSERT_TRUE(waitFor("serviceInitialized"));
+        ASSERT_TRUE(recorder->arrived("serviceInitialized"));
         client->startTLS();
     }
-    ASSERT_TRUE(waitFor("connectionTimedOut"));
+    ASSERT_TRUE(recorder->arrived("connectionTimedOut"));
     recorder->settle();
 
     EXPECT_EQ(recorder->count(QStringLiteral("connectionTimedOut")), 1);
