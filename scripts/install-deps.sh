@@ -9,6 +9,7 @@ packages=(
   libgmime-3.0-dev
   libgtest-dev libgmock-dev libbenchmark-dev
   clang libclang-rt-14-dev
+  python3-aiosmtpd openssl
   postfix
 )
 

@@ -1,0 +1,701 @@
+#include "smtp/SmtpClient.h"
+
+#include <QCryptographicHash>
+#include <QDir>
+#include <QHostAddress>
+#include <QHostInfo>
+#include <QMessageAuthenticationCode>
+#include <QMetaEnum>
+#include <QMutex>
+#include <QRegularExpression>
+#include <QSet>
+#include <QSslSocket>
+
+#include <algorithm>
+#include <functional>
+#include <optional>
+#include <utility>
+
+namespace {
+
+// A reply this long without its last line is not SMTP (RFC 5321 4.5.3.1.5 allows 512 per
+// line); refusing it keeps a broken server from filling memory.
+constexpr qsizetype maxReplySize = 64 * 1024;
+
+bool isPositive(int code) {
+    return code >= 200 && code < 300;
+}
+
+// RFC 5321 4.2: Reply-line = *( Reply-code "-" [ textstring ] CRLF )
+//                            Reply-code [ SP textstring ] CRLF
+bool isReplyLine(const QByteArray& line) {
+    if (line.size() < 3 ||
+        !std::all_of(line.begin(), line.begin() + 3, [](char c) { return c >= '0' && c <= '9'; }))
+        return false;
+    return line.size() == 3 || line[3] == ' ' || line[3] == '-';
+}
+
+QByteArray withoutLineEnd(QByteArray line) {
+    while (line.endsWith('\n') || line.endsWith('\r'))
+        line.chop(1);
+    return line;
+}
+
+// Lone CR and lone LF become CRLF, and the message ends with a line end: RFC 5321 2.3.8
+// allows no other line ends in DATA.
+QByteArray normalizeLineEnds(const QByteArray& message) {
+    QByteArray out;
+    out.reserve(message.size() + 2);
+    for (qsizetype i = 0; i < message.size(); ++i) {
+        const char c = message[i];
+        if (c == '\r' || c == '\n') {
+            out += "\r\n";
+            if (c == '\r' && i + 1 < message.size() && message[i + 1] == '\n')
+                ++i;
+        } else {
+            out += c;
+        }
+    }
+    if (!out.isEmpty() && !out.endsWith("\r\n"))
+        out += "\r\n";
+    return out;
+}
+
+// RFC 5321 4.5.2: dot-stuffing, then the end of data "CRLF.CRLF" (the message already ends
+// with CRLF).
+QByteArray dataBlock(const QByteArray& normalized) {
+    QByteArray out = normalized;
+    out.replace("\r\n.", "\r\n..");
+    if (out.startsWith('.'))
+        out.prepend('.');
+    return out + ".\r\n";
+}
+
+bool hasLineBreakOrNul(const QString& text) {
+    return text.contains(QLatin1Char('\r')) || text.contains(QLatin1Char('\n')) ||
+           text.contains(QChar(0));
+}
+
+// Control characters would end or split the command; angle brackets would close the path
+// early and smuggle in parameters (RFC 5321 4.1.2 Path).
+bool isEnvelopeSafe(const QString& address) {
+    return std::none_of(address.begin(), address.end(), [](QChar c) {
+        return c.unicode() < 0x20 || c.unicode() == 0x7f || c == QLatin1Char('<') ||
+               c == QLatin1Char('>');
+    });
+}
+
+QString printable(QString text) {
+    for (QChar& c : text)
+        if (c.unicode() < 0x20 || c.unicode() == 0x7f)
+            c = QLatin1Char('?');
+    return text;
+}
+
+// RFC 5321 4.1.4: EHLO names the client by its fully qualified domain name.
+bool isDomainName(const QString& name) {
+    static const QRegularExpression domain(
+        QStringLiteral("^[A-Za-z0-9]([A-Za-z0-9-]*[A-Za-z0-9])?(\\.[A-Za-z0-9]([A-Za-z0-9-]*["
+                       "A-Za-z0-9])?)+$"));
+    return domain.match(name).hasMatch();
+}
+
+void wipe(QByteArray& secret) {
+    secret.fill('\0');
+    secret.clear();
+}
+
+QList<QSslCertificate> readCaCertificates(const QString& file, const QString& folders) {
+    QList<QSslCertificate> added;
+    if (!file.isEmpty())
+        added += QSslCertificate::fromPath(file, QSsl::Pem);
+    for (const QString& folder : folders.split(QLatin1Char(':'), Qt::SkipEmptyParts))
+        added += QSslCertificate::fromPath(QDir(folder).filePath(QStringLiteral("*")), QSsl::Pem,
+                                           QSslCertificate::PatternSyntax::Wildcard);
+    if (added.isEmpty())
+        return {};
+    // Any CA list turns off Qt's loading of the system store on demand, so the system's
+    // certificates must be in it too.
+    QList<QSslCertificate> all;
+    QSet<QSslCertificate> seen;
+    for (const QSslCertificate& certificate : QSslConfiguration::systemCaCertificates() + added) {
+        if (seen.contains(certificate))
+            continue;
+        seen.insert(certificate);
+        all += certificate;
+    }
+    return all;
+}
+
+// Reading hundreds of certificate files takes a noticeable while, and a mailing run opens one
+// connection per recipient: the list is read again only when the variables change.
+QList<QSslCertificate> caCertificates(const QString& file, const QString& folders) {
+    static QMutex mutex;
+    static QString cachedFile;
+    static QString cachedFolders;
+    static std::optional<QList<QSslCertificate>> cached;
+    const QMutexLocker lock(&mutex);
+    if (!cached || file != cachedFile || folders != cachedFolders) {
+        cached = readCaCertificates(file, folders);
+        cachedFile = file;
+        cachedFolders = folders;
+    }
+    return *cached;
+}
+
+} // namespace
+
+SmtpClient::SmtpClient(const QString& host, quint16 port, std::chrono::seconds timeout,
+                       QObject* parent)
+    : SmtpSession(parent), m_socket(new QSslSocket(this)), m_host(host), m_port(port),
+      m_timeoutCap(timeout), m_implicitTLS(port == 465) {
+    m_timer.setSingleShot(true);
+    connect(&m_timer, &QTimer::timeout, this, &SmtpClient::onTimeout);
+    connect(m_socket, &QSslSocket::connected, this, &SmtpClient::onConnected);
+    connect(m_socket, &QSslSocket::encrypted, this, &SmtpClient::onEncrypted);
+    connect(m_socket, &QSslSocket::readyRead, this, &SmtpClient::readReplies);
+    connect(m_socket, &QSslSocket::errorOccurred, this, &SmtpClient::onSocketError);
+    connect(m_socket, &QSslSocket::disconnected, this, &SmtpClient::onDisconnected);
+    connect(m_socket, &QSslSocket::sslErrors, this,
+            [this](const QList<QSslError>& errors) { m_sslErrors = errors; });
+    // A large message on a slow link may take long to write: the end-of-data limit counts
+    // from the last progress, not from the start.
+    connect(m_socket, &QSslSocket::bytesWritten, this, [this] {
+        if (m_state == State::DataEnd)
+            startTimer(dataEndLimit);
+    });
+}
+
+SmtpClient::~SmtpClient() {
+    forgetCredentials();
+}
+
+QSslConfiguration SmtpClient::tlsConfiguration() {
+    QSslConfiguration configuration = QSslConfiguration::defaultConfiguration();
+    const QList<QSslCertificate> trusted =
+        caCertificates(qEnvironmentVariable("SSL_CERT_FILE"), qEnvironmentVariable("SSL_CERT_DIR"));
+    if (!trusted.isEmpty())
+        configuration.setCaCertificates(configuration.caCertificates() + trusted);
+    return configuration;
+}
+
+void SmtpClient::connectInBackgroundAndNotify() {
+    if (!expect(State::Unconnected, "connectInBackgroundAndNotify"))
+        return;
+    enter(State::Connecting);
+    m_socket->connectToHost(m_host, m_port);
+}
+
+void SmtpClient::setImplicitTLS(bool implicit) {
+    if (expect(State::Unconnected, "setImplicitTLS"))
+        m_implicitTLS = implicit;
+}
+
+bool SmtpClient::isSSL() const {
+    return m_implicitTLS || m_socket->isEncrypted();
+}
+
+void SmtpClient::startSSL() {
+    if (expect(State::AwaitingSSL, "startSSL"))
+        startEncryption(State::SSLHandshake);
+}
+
+void SmtpClient::startTLS() {
+    if (!expect(State::Ready, "startTLS") || isSSL())
+        return;
+    send("STARTTLS");
+    enter(State::StartTLS);
+}
+
+QStringList SmtpClient::supportedMechanisms() const {
+    return m_mechanisms;
+}
+
+void SmtpClient::authenticate(const QString& user, const QString& password,
+                              const QString& mechanism) {
+    if (!expect(State::Ready, "authenticate"))
+        return;
+    if (hasLineBreakOrNul(user) || hasLineBreakOrNul(password) || hasLineBreakOrNul(mechanism))
+        return failAuthentication(
+            tr("The user name, password or mechanism contains a line break or NUL character."));
+    m_user = user.toUtf8();
+    m_password = password.toUtf8();
+    const QString name = mechanism.toUpper();
+    if (name == QLatin1String("PLAIN")) {
+        // RFC 4616 2: authzid NUL authcid NUL passwd, sent as the initial response.
+        send("AUTH PLAIN " + (QByteArray(1, '\0') + m_user + '\0' + m_password).toBase64());
+        enter(State::AuthResult);
+    } else if (name == QLatin1String("LOGIN")) {
+        send("AUTH LOGIN");
+        enter(State::AuthLoginUser);
+    } else if (name == QLatin1String("CRAM-MD5")) {
+        send("AUTH CRAM-MD5");
+        enter(State::AuthCramChallenge);
+    } else {
+        failAuthentication(tr("Unknown authentication mechanism \"%1\".").arg(mechanism));
+    }
+}
+
+void SmtpClient::setMessage(const QByteArray& message, const QString& sender,
+                            const QStringList& recipients) {
+    m_message = normalizeLineEnds(message);
+    m_sender = sender;
+    m_recipients = recipients;
+}
+
+void SmtpClient::sendMessage() {
+    if (!expect(State::Ready, "sendMessage"))
+        return;
+    if (const QString problem = envelopeProblem(); !problem.isEmpty())
+        return refuseBeforeSending(problem);
+    if (m_sizeLimit > 0 && m_message.size() > m_sizeLimit)
+        return refuseBeforeSending(
+            tr("The message (%1 bytes) is larger than the %2 bytes the server accepts.")
+                .arg(m_message.size())
+                .arg(m_sizeLimit));
+    QByteArray command = "MAIL FROM:<" + m_sender.toUtf8() + '>';
+    if (m_sizeExtension) // RFC 1870 6: declare the size so the server can refuse it early
+        command += " SIZE=" + QByteArray::number(m_message.size());
+    send(command);
+    enter(State::MailFrom);
+}
+
+void SmtpClient::close() {
+    switch (m_state) {
+    case State::Closed:
+    case State::Quit:
+        return;
+    case State::Unconnected:
+    case State::Connecting:
+    case State::AwaitingSSL:
+    case State::SSLHandshake:
+    case State::TLSHandshake:
+        return finish(&SmtpSession::connectionTerminated, {});
+    default:
+        send("QUIT");
+        enter(State::Quit);
+    }
+}
+
+QByteArray SmtpClient::lastResponse() const {
+    return m_lastResponse;
+}
+
+QString SmtpClient::errorString() const {
+    return m_errorString;
+}
+
+bool SmtpClient::expect(State state, const char* operation) const {
+    if (m_state == state)
+        return true;
+    qWarning("SmtpClient: %s ignored in state %s", operation,
+             QMetaEnum::fromType<State>().valueToKey(int(m_state)));
+    return false;
+}
+
+void SmtpClient::notify(Signal signal) {
+    QMetaObject::invokeMethod(
+        this, [this, signal] { Q_EMIT std::invoke(signal, this); }, Qt::QueuedConnection);
+}
+
+void SmtpClient::finish(Signal signal, const QString& why) {
+    if (m_state == State::Closed)
+        return;
+    if (!why.isEmpty())
+        m_errorString = why;
+    enter(State::Closed);
+    forgetCredentials();
+    m_socket->abort();
+    notify(signal);
+}
+
+void SmtpClient::enter(State state) {
+    m_state = state;
+    switch (state) {
+    case State::Unconnected:
+    case State::Ready:
+    case State::Closed:
+        m_timer.stop();
+        return;
+    case State::Connecting:
+        return startTimer(connectLimit);
+    case State::DataEnd:
+        return startTimer(dataEndLimit);
+    default:
+        return startTimer(replyLimit);
+    }
+}
+
+void SmtpClient::startTimer(std::chrono::seconds limit) {
+    if (m_timeoutCap > std::chrono::seconds::zero())
+        limit = std::min(limit, m_timeoutCap);
+    m_timer.start(limit);
+}
+
+void SmtpClient::send(const QByteArray& command) {
+    m_socket->write(command + "\r\n");
+}
+
+void SmtpClient::forgetCredentials() {
+    wipe(m_user);
+    wipe(m_password);
+}
+
+void SmtpClient::onConnected() {
+    if (m_state != State::Connecting)
+        return;
+    notify(&SmtpSession::connectionEstablished);
+    enter(m_implicitTLS ? State::AwaitingSSL : State::Greeting);
+}
+
+void SmtpClient::onEncrypted() {
+    if (m_state == State::SSLHandshake) {
+        enter(State::Greeting);
+    } else if (m_state == State::TLSHandshake) {
+        sendEhlo();
+    }
+    readReplies();
+}
+
+void SmtpClient::onSocketError() {
+    if (m_socket->error() == QAbstractSocket::RemoteHostClosedError)
+        return onDisconnected();
+    switch (m_state) {
+    case State::Connecting:
+        return finish(&SmtpSession::connectionTimedOut, tr("Could not connect to %1:%2: %3")
+                                                            .arg(m_host)
+                                                            .arg(m_port)
+                                                            .arg(m_socket->errorString()));
+    case State::SSLHandshake:
+    case State::TLSHandshake:
+        return failHandshake();
+    case State::Quit:
+        return finish(&SmtpSession::connectionTerminated, {});
+    default:
+        return finish(&SmtpSession::connectionLost,
+                      tr("Connection to %1 lost: %2").arg(m_host, m_socket->errorString()));
+    }
+}
+
+void SmtpClient::onDisconnected() {
+    switch (m_state) {
+    case State::Closed:
+        return;
+    case State::Quit:
+        return finish(&SmtpSession::connectionTerminated, {});
+    case State::SSLHandshake:
+    case State::TLSHandshake:
+        return failHandshake();
+    default:
+        return finish(&SmtpSession::connectionLost,
+                      tr("The server %1 closed the connection.").arg(m_host));
+    }
+}
+
+void SmtpClient::onTimeout() {
+    if (m_state == State::Quit)
+        return finish(&SmtpSession::connectionTerminated, {});
+    const auto waited =
+        std::chrono::duration_cast<std::chrono::seconds>(m_timer.intervalAsDuration());
+    finish(&SmtpSession::connectionTimedOut,
+           m_state == State::Connecting
+               ? tr("Could not connect to %1:%2 within %3 s.")
+                     .arg(m_host)
+                     .arg(m_port)
+                     .arg(waited.count())
+               : tr("The server %1 did not answer within %2 s.").arg(m_host).arg(waited.count()));
+}
+
+void SmtpClient::failHandshake() {
+    QStringList reasons;
+    for (const QSslError& error : m_sslErrors)
+        reasons += error.errorString();
+    const QString reason =
+        reasons.isEmpty() ? m_socket->errorString() : reasons.join(QStringLiteral("; "));
+    failTLS(tr("TLS handshake with %1 failed: %2").arg(m_host, reason));
+}
+
+bool SmtpClient::readsReplies() const {
+    switch (m_state) {
+    case State::Unconnected:
+    case State::Connecting:
+    case State::AwaitingSSL:
+    case State::SSLHandshake:
+    case State::TLSHandshake:
+    case State::Closed:
+        return false;
+    default:
+        return true;
+    }
+}
+
+void SmtpClient::readReplies() {
+    while (readsReplies() && m_socket->canReadLine()) {
+        const QByteArray raw = m_socket->readLine();
+        const QByteArray line = withoutLineEnd(raw);
+        m_pendingReply += raw;
+        if (!isReplyLine(line))
+            return finish(&SmtpSession::connectionLost,
+                          tr("The server %1 sent a malformed reply: %2")
+                              .arg(m_host, printable(QString::fromUtf8(line))));
+        if (line.size() > 3 && line[3] == '-')
+            continue; // RFC 5321 4.2.1: more lines of this reply follow
+        m_lastResponse = std::exchange(m_pendingReply, {});
+        handleReply(line.left(3).toInt());
+    }
+    if (readsReplies() && m_pendingReply.size() + m_socket->bytesAvailable() > maxReplySize)
+        finish(&SmtpSession::connectionLost,
+               tr("The server %1 sent an overlong reply.").arg(m_host));
+}
+
+void SmtpClient::handleReply(int code) {
+    switch (m_state) {
+    case State::Greeting:
+        return onGreeting(code);
+    case State::Ehlo:
+        return onEhlo(code);
+    case State::Helo:
+        return onHelo(code);
+    case State::StartTLS:
+        return onStartTLS(code);
+    case State::AuthLoginUser:
+    case State::AuthLoginPassword:
+    case State::AuthCramChallenge:
+    case State::AuthResult:
+    case State::AuthCancelled:
+        return onAuthReply(code);
+    case State::MailFrom:
+        return onMailFrom(code);
+    case State::RcptTo:
+        return onRcptTo(code);
+    case State::Data:
+        return onData(code);
+    case State::DataEnd:
+        return onDataEnd(code);
+    case State::Quit:
+        return onQuit(code);
+    default: // Ready: unasked, such as a 421 before the server closes; kept as lastResponse
+        return;
+    }
+}
+
+void SmtpClient::onGreeting(int code) {
+    if (code == 220)
+        return sendEhlo();
+    // RFC 5321 3.1: after a 554 greeting the client should still send QUIT.
+    send("QUIT");
+    m_socket->flush();
+    finish(&SmtpSession::connectionLost,
+           tr("The server %1 refused the session: %2").arg(m_host, replyText()));
+}
+
+void SmtpClient::sendEhlo() {
+    // RFC 3207 4.2: what the server announced before TLS is forgotten.
+    m_mechanisms.clear();
+    m_sizeExtension = false;
+    m_sizeLimit = 0;
+    send("EHLO " + ehloDomain());
+    enter(State::Ehlo);
+}
+
+void SmtpClient::onEhlo(int code) {
+    if (isPositive(code)) {
+        parseCapabilities();
+        enter(State::Ready);
+        return notify(&SmtpSession::serviceInitialized);
+    }
+    // RFC 5321 4.1.1.1: a server that does not know EHLO answers 5xx; HELO then.
+    if (code >= 500) {
+        send("HELO " + ehloDomain());
+        return enter(State::Helo);
+    }
+    finish(&SmtpSession::connectionLost,
+           tr("The server %1 refused EHLO: %2").arg(m_host, replyText()));
+}
+
+void SmtpClient::onHelo(int code) {
+    if (!isPositive(code))
+        return finish(&SmtpSession::connectionLost,
+                      tr("The server %1 refused HELO: %2").arg(m_host, replyText()));
+    enter(State::Ready);
+    notify(&SmtpSession::serviceInitialized);
+}
+
+// RFC 5321 4.1.1.1: every line after the first of a 250 EHLO reply is "keyword [params]".
+void SmtpClient::parseCapabilities() {
+    // Some servers still write the pre-standard "AUTH=LOGIN PLAIN".
+    static const QRegularExpression separators(QStringLiteral("[ =]"));
+    const QList<QByteArray> lines = m_lastResponse.split('\n');
+    for (qsizetype i = 1; i < lines.size(); ++i) {
+        const QString text = QString::fromUtf8(withoutLineEnd(lines[i]).mid(4)).toUpper();
+        const QStringList words = text.split(separators, Qt::SkipEmptyParts);
+        if (words.isEmpty())
+            continue;
+        if (words[0] == QLatin1String("AUTH")) {
+            for (const QString& mechanism : words.mid(1))
+                if (!m_mechanisms.contains(mechanism))
+                    m_mechanisms += mechanism;
+        } else if (words[0] == QLatin1String("SIZE")) {
+            // RFC 1870 4: SIZE without a number, or 0, means no fixed limit.
+            m_sizeExtension = true;
+            m_sizeLimit = words.size() > 1 ? words[1].toLongLong() : 0;
+        }
+    }
+}
+
+void SmtpClient::onStartTLS(int code) {
+    if (code != 220)
+        return failTLS(tr("The server %1 refused STARTTLS: %2").arg(m_host, replyText()));
+    // RFC 3207 5: anything the server sent after its 220 and before TLS cannot be trusted.
+    m_socket->readAll();
+    startEncryption(State::TLSHandshake);
+}
+
+void SmtpClient::onAuthReply(int code) {
+    if (code == 334)
+        return answerChallenge();
+    const bool accepted = code == 235 && m_state != State::AuthCancelled;
+    forgetCredentials();
+    enter(State::Ready);
+    if (accepted)
+        return notify(&SmtpSession::authenticationCompleted);
+    m_errorString = tr("The server %1 refused the authentication: %2").arg(m_host, replyText());
+    notify(&SmtpSession::authenticationFailed);
+}
+
+void SmtpClient::answerChallenge() {
+    switch (m_state) {
+    case State::AuthLoginUser:
+        send(m_user.toBase64());
+        return enter(State::AuthLoginPassword);
+    case State::AuthLoginPassword:
+        send(m_password.toBase64());
+        return enter(State::AuthResult);
+    case State::AuthCramChallenge:
+        if (const auto response = cramMd5Response(); !response.isEmpty()) {
+            send(response);
+            return enter(State::AuthResult);
+        }
+        break;
+    default:
+        break;
+    }
+    // RFC 4954 4: "*" cancels an exchange the client cannot go on with.
+    send("*");
+    enter(State::AuthCancelled);
+}
+
+// RFC 2195 2: base64 of "user SP hex(HMAC-MD5(password, challenge))".
+QByteArray SmtpClient::cramMd5Response() const {
+    const auto decoded = QByteArray::fromBase64Encoding(
+        withoutLineEnd(m_lastResponse).mid(4).trimmed(), QByteArray::AbortOnBase64DecodingErrors);
+    if (!decoded || decoded.decoded.isEmpty())
+        return {};
+    const QByteArray digest =
+        QMessageAuthenticationCode::hash(decoded.decoded, m_password, QCryptographicHash::Md5)
+            .toHex();
+    return (m_user + ' ' + digest).toBase64();
+}
+
+void SmtpClient::failAuthentication(const QString& why) {
+    m_lastResponse.clear();
+    m_errorString = why;
+    forgetCredentials();
+    notify(&SmtpSession::authenticationFailed);
+}
+
+QString SmtpClient::envelopeProblem() const {
+    if (m_recipients.isEmpty())
+        return tr("The message has no recipient.");
+    if (!isEnvelopeSafe(m_sender))
+        return tr("The sender address \"%1\" contains a control character or an angle bracket.")
+            .arg(printable(m_sender));
+    for (const QString& recipient : m_recipients)
+        if (!isEnvelopeSafe(recipient))
+            return tr("The recipient address \"%1\" contains a control character or an angle "
+                      "bracket.")
+                .arg(printable(recipient));
+    return {};
+}
+
+void SmtpClient::refuseBeforeSending(const QString& why) {
+    m_lastResponse.clear();
+    m_errorString = why;
+    notify(&SmtpSession::messageNotSent);
+}
+
+void SmtpClient::refuseMessage() {
+    m_errorString = tr("The server %1 refused the message: %2").arg(m_host, replyText());
+    enter(State::Ready);
+    notify(&SmtpSession::messageNotSent);
+}
+
+void SmtpClient::onMailFrom(int code) {
+    if (!isPositive(code))
+        return refuseMessage();
+    m_nextRecipient = 0;
+    sendNextRecipient();
+}
+
+void SmtpClient::sendNextRecipient() {
+    send("RCPT TO:<" + m_recipients[m_nextRecipient++].toUtf8() + '>');
+    enter(State::RcptTo);
+}
+
+// A refused recipient stops the whole transaction: a personalised copy goes to all its
+// recipients or to none.
+void SmtpClient::onRcptTo(int code) {
+    if (!isPositive(code))
+        return refuseMessage();
+    if (m_nextRecipient < m_recipients.size())
+        return sendNextRecipient();
+    send("DATA");
+    enter(State::Data);
+}
+
+void SmtpClient::onData(int code) {
+    if (code != 354)
+        return refuseMessage();
+    m_socket->write(dataBlock(m_message));
+    enter(State::DataEnd);
+}
+
+void SmtpClient::onDataEnd(int code) {
+    if (!isPositive(code))
+        return refuseMessage();
+    enter(State::Ready);
+    notify(&SmtpSession::messageSent);
+}
+
+// Replies still due for earlier commands may come first; only QUIT's 221 ends the wait.
+void SmtpClient::onQuit(int code) {
+    if (code == 221)
+        finish(&SmtpSession::connectionTerminated, {});
+}
+
+// The trust store is read only when a session really goes TLS.
+void SmtpClient::startEncryption(State handshake) {
+    m_socket->setSslConfiguration(tlsConfiguration());
+    enter(handshake);
+    m_socket->startClientEncryption();
+}
+
+void SmtpClient::failTLS(const QString& why) {
+    finish(&SmtpSession::connectionTimedOut, why);
+}
+
+QByteArray SmtpClient::ehloDomain() const {
+    const QString name = QHostInfo::localHostName();
+    if (isDomainName(name))
+        return name.toLatin1();
+    // RFC 5321 4.1.3: address literals, for a host without a domain name.
+    QHostAddress address = m_socket->localAddress();
+    address.setScopeId({});
+    if (address.protocol() == QAbstractSocket::IPv6Protocol)
+        return "[IPv6:" + address.toString().toLatin1() + ']';
+    return '[' + address.toString().toLatin1() + ']';
+}
+
+QString SmtpClient::replyText() const {
+    return QString::fromUtf8(m_lastResponse).simplified();
+}

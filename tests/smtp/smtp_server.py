@@ -1,0 +1,126 @@
+#!/usr/bin/env python3
+"""A real SMTP server for the SmtpClient tests, built on aiosmtpd.
+
+Listens on 127.0.0.1 (a free port unless --port is given) and prints "PORT <n>" once it
+accepts connections. Every message it accepts is printed as one JSON line:
+{"mail_from": ..., "mail_options": [...], "rcpt_tos": [...], "data": <base64 of the bytes>}.
+It stops when its standard input closes or after --lifetime seconds, whichever comes first,
+so a test that dies never leaves it behind.
+"""
+
+import argparse
+import asyncio
+import base64
+import hmac
+import json
+import logging
+import os
+import secrets
+import ssl
+import sys
+
+from aiosmtpd.smtp import SMTP, AuthResult, LoginPassword, auth_mechanism
+
+
+class Handler:
+    def __init__(self, user, password, refused_recipients):
+        self.user = user
+        self.password = password
+        self.refused_recipients = set(refused_recipients)
+
+    async def handle_RCPT(self, server, session, envelope, address, rcpt_options):
+        if address in self.refused_recipients:
+            return f"550 5.1.1 <{address}>: Recipient address rejected"
+        envelope.rcpt_tos.append(address)
+        return "250 2.1.5 OK"
+
+    async def handle_DATA(self, server, session, envelope):
+        record = {
+            "mail_from": envelope.mail_from,
+            "mail_options": envelope.mail_options,
+            "rcpt_tos": envelope.rcpt_tos,
+            "data": base64.b64encode(envelope.original_content).decode("ascii"),
+        }
+        print(json.dumps(record), flush=True)
+        return "250 2.0.0 Message accepted"
+
+    # RFC 2195: the client answers "user SP hex(HMAC-MD5(password, challenge))".
+    @auth_mechanism("CRAM-MD5")
+    async def auth_CRAM_MD5(self, server, args):
+        challenge = f"<{secrets.token_hex(8)}@localhost>".encode("ascii")
+        response = await server.challenge_auth(challenge)
+        if not isinstance(response, bytes):
+            return AuthResult(success=False, handled=True)
+        user, _, digest = response.rpartition(b" ")
+        expected = hmac.new(self.password, challenge, "md5").hexdigest().encode("ascii")
+        ok = user == self.user and hmac.compare_digest(digest, expected)
+        return AuthResult(success=ok, handled=False)
+
+    def authenticate(self, server, session, envelope, mechanism, auth_data):
+        ok = (
+            isinstance(auth_data, LoginPassword)
+            and auth_data.login == self.user
+            and hmac.compare_digest(auth_data.password, self.password)
+        )
+        return AuthResult(success=ok, handled=False)
+
+
+def tls_context(args):
+    context = ssl.create_default_context(ssl.Purpose.CLIENT_AUTH)
+    context.load_cert_chain(args.cert, args.key)
+    return context
+
+
+def parse_arguments():
+    parser = argparse.ArgumentParser(description=__doc__)
+    parser.add_argument("--port", type=int, default=0)
+    parser.add_argument("--tls", choices=["none", "starttls", "implicit"], default="none")
+    parser.add_argument("--require-starttls", action="store_true")
+    parser.add_argument("--cert", help="server certificate (PEM), for --tls starttls or implicit")
+    parser.add_argument("--key", help="its private key (PEM)")
+    parser.add_argument("--user", default="user")
+    parser.add_argument("--password", default="secret")
+    parser.add_argument("--refuse-recipient", action="append", default=[])
+    parser.add_argument("--size", type=int, default=10 * 1024 * 1024, help="announced SIZE")
+    parser.add_argument("--lifetime", type=float, default=60.0)
+    return parser.parse_args()
+
+
+def main():
+    args = parse_arguments()
+    logging.getLogger("mail.log").setLevel(logging.CRITICAL)
+    handler = Handler(args.user.encode(), args.password.encode(), args.refuse_recipient)
+    starttls = tls_context(args) if args.tls == "starttls" else None
+    implicit = tls_context(args) if args.tls == "implicit" else None
+    loop = asyncio.new_event_loop()
+
+    def new_session():
+        return SMTP(
+            handler,
+            hostname="localhost",
+            tls_context=starttls,
+            require_starttls=args.require_starttls,
+            # With STARTTLS, AUTH is announced only once TLS is up, as real servers do.
+            auth_require_tls=starttls is not None,
+            authenticator=handler.authenticate,
+            data_size_limit=args.size,
+            loop=loop,
+        )
+
+    server = loop.run_until_complete(
+        loop.create_server(new_session, "127.0.0.1", args.port, ssl=implicit)
+    )
+    print(f"PORT {server.sockets[0].getsockname()[1]}", flush=True)
+
+    def on_stdin():
+        if not os.read(sys.stdin.fileno(), 4096):
+            loop.stop()
+
+    loop.add_reader(sys.stdin.fileno(), on_stdin)
+    loop.call_later(args.lifetime, loop.stop)
+    loop.run_forever()
+    server.close()
+
+
+if __name__ == "__main__":
+    main()
