@@ -40,6 +40,7 @@ const QStringList kSettingKeys = {
     QStringLiteral("loginUsername"),
     QStringLiteral("loginPassword"),
     QStringLiteral("smtpTimeout"),
+    QStringLiteral("implicitTLS"),
 };
 
 struct SendOptions {

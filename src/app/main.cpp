@@ -2,12 +2,21 @@
 
 #include <QGuiApplication>
 
+#include <cstring>
+#include <memory>
+
 int main(int argc, char** argv) {
-    // Commands run where there may be no display (cron, ssh); the message body still needs
-    // Qt's text layout, which the offscreen platform provides.
-    if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM"))
-        qputenv("QT_QPA_PLATFORM", "offscreen");
-    QGuiApplication app(argc, argv);
+    // A mailing run lays its message body out with Qt's GUI text classes; on the offscreen
+    // platform that needs no display, so it runs from cron and ssh too. The other commands
+    // need no GUI at all.
+    std::unique_ptr<QCoreApplication> app;
+    if (argc > 1 && std::strcmp(argv[1], "send") == 0) {
+        if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM"))
+            qputenv("QT_QPA_PLATFORM", "offscreen");
+        app = std::make_unique<QGuiApplication>(argc, argv);
+    } else {
+        app = std::make_unique<QCoreApplication>(argc, argv);
+    }
     QCoreApplication::setOrganizationName(QStringLiteral("Orvale Software"));
     QCoreApplication::setApplicationName(QStringLiteral("Pelmo"));
     QCoreApplication::setApplicationVersion(QStringLiteral(PELMO_VERSION));

@@ -433,10 +433,12 @@ SmtpSession* PelmoController::createSession(const QString& host, int port) {
     if (sessionFactory)
         return sessionFactory(host, port);
     // "smtpTimeout" (seconds) shortens the waits for slow links and for tests.
-    const int timeout = integerSetting("smtpTimeout");
-    return new SmtpClient(host, static_cast<quint16>(port),
-                          timeout > 0 ? std::chrono::seconds(timeout)
-                                      : SmtpClient::kDefaultTimeout);
+    auto* client = new SmtpClient(host, static_cast<quint16>(port),
+                                  std::chrono::seconds(integerSetting("smtpTimeout")));
+    // Port 465 is implicit TLS by itself; "implicitTLS" is for servers that use it elsewhere.
+    if (setting("implicitTLS").toBool())
+        client->setImplicitTLS(true);
+    return client;
 }
 
 void PelmoController::setSessionFactory(SessionFactory factory) {

@@ -1,0 +1,161 @@
+#include "E2eSupport.h"
+
+#include <QDir>
+#include <QJsonDocument>
+#include <QJsonObject>
+#include <QRegularExpression>
+
+#include <gmime/gmime.h>
+
+ServerProcess::ServerProcess(const QString& script, const QStringList& arguments) {
+    m_process.setProgram(QStringLiteral(PELMO_PYTHON3));
+    m_process.setArguments(QStringList{QStringLiteral("-u"), script} + arguments);
+    m_process.start();
+    static const QRegularExpression portLine(QStringLiteral(R"(^PORT (\d+)\r?\n)"));
+    while (m_port == 0 && m_process.waitForReadyRead(10000)) {
+        m_output += m_process.readAllStandardOutput();
+        const QRegularExpressionMatch match = portLine.match(QString::fromLatin1(m_output));
+        if (match.hasMatch()) {
+            m_port = match.captured(1).toInt();
+            m_output = m_output.mid(match.capturedLength());
+        }
+    }
+}
+
+ServerProcess::~ServerProcess() {
+    m_process.closeWriteChannel(); // the server stops when its input closes
+    if (!m_process.waitForFinished(3000))
+        m_process.kill();
+    m_process.waitForFinished();
+}
+
+QList<QByteArray> ServerProcess::records() {
+    m_process.waitForReadyRead(200);
+    m_output += m_process.readAllStandardOutput();
+    QList<QByteArray> lines = m_output.split('\n');
+    lines.removeAll(QByteArray());
+    return lines;
+}
+
+namespace {
+
+bool openssl(const QStringList& arguments, const QString& folder) {
+    QProcess process;
+    process.setWorkingDirectory(folder);
+    process.start(QStringLiteral("openssl"), arguments);
+    return process.waitForFinished(30000) && process.exitCode() == 0;
+}
+
+} // namespace
+
+Certificates::Certificates(const QString& folder)
+    : ca(folder + QStringLiteral("/ca.pem")), cert(folder + QStringLiteral("/server.pem")),
+      key(folder + QStringLiteral("/server.key")) {
+    QFile extensions(folder + QStringLiteral("/san.cnf"));
+    extensions.open(QIODevice::WriteOnly);
+    extensions.write("subjectAltName=DNS:localhost,IP:127.0.0.1\n");
+    extensions.close();
+    ok =
+        openssl(QString("req -x509 -newkey rsa:2048 -nodes -days 2 -subj /CN=Pelmo-Test-CA -keyout "
+                        "ca.key -out ca.pem")
+                    .split(QLatin1Char(' ')),
+                folder) &&
+        openssl(QString("req -newkey rsa:2048 -nodes -subj /CN=localhost -keyout server.key -out "
+                        "server.csr")
+                    .split(QLatin1Char(' ')),
+                folder) &&
+        openssl(QString("x509 -req -in server.csr -CA ca.pem -CAkey ca.key -CAcreateserial -days 2 "
+                        "-extfile san.cnf -out server.pem")
+                    .split(QLatin1Char(' ')),
+                folder);
+}
+
+PelmoRun runPelmo(const QStringList& arguments, const QProcessEnvironment& environment) {
+    QProcess process;
+    process.setProcessEnvironment(environment);
+    process.start(QStringLiteral(PELMO_EXECUTABLE), arguments);
+    process.closeWriteChannel();
+    PelmoRun run;
+    if (!process.waitForFinished(60000)) {
+        process.kill();
+        process.waitForFinished();
+        return run;
+    }
+    run.status = process.exitStatus() == QProcess::NormalExit ? process.exitCode() : -1;
+    run.out = QString::fromUtf8(process.readAllStandardOutput());
+    run.err = QString::fromUtf8(process.readAllStandardError());
+    return run;
+}
+
+QByteArray messageOf(const QByteArray& record) {
+    const QJsonObject object = QJsonDocument::fromJson(record).object();
+    return QByteArray::fromBase64(object.value(QStringLiteral("data")).toString().toLatin1());
+}
+
+namespace {
+
+QString owned(char* text) {
+    const QString copy = QString::fromUtf8(text);
+    g_free(text);
+    return copy;
+}
+
+ReceivedPart partOf(GMimeObject* object) {
+    ReceivedPart part;
+    part.mimeType =
+        owned(g_mime_content_type_get_mime_type(g_mime_object_get_content_type(object)));
+    part.charset = QString::fromUtf8(g_mime_object_get_content_type_parameter(object, "charset"));
+    if (!GMIME_IS_PART(object))
+        return part;
+    GMimePart* leaf = GMIME_PART(object);
+    part.encoding = QString::fromLatin1(
+        g_mime_content_encoding_to_string(g_mime_part_get_content_encoding(leaf)));
+    part.filename = QString::fromUtf8(g_mime_part_get_filename(leaf));
+    GMimeStream* sink = g_mime_stream_mem_new();
+    g_mime_data_wrapper_write_to_stream(g_mime_part_get_content(leaf), sink);
+    GByteArray* bytes = g_mime_stream_mem_get_byte_array(GMIME_STREAM_MEM(sink));
+    part.content =
+        QByteArray(reinterpret_cast<const char*>(bytes->data), static_cast<qsizetype>(bytes->len));
+    g_object_unref(sink);
+    return part;
+}
+
+QString addresses(InternetAddressList* list) {
+    return list == nullptr ? QString()
+                           : owned(internet_address_list_to_string(list, nullptr, FALSE));
+}
+
+} // namespace
+
+ReceivedMessage parseMessage(const QByteArray& bytes) {
+    static const bool ready = (g_mime_init(), true);
+    (void)ready;
+    ReceivedMessage message;
+    message.bareLineFeed = QRegularExpression(QStringLiteral("[^\\r]\\n"))
+                               .match(QString::fromLatin1(bytes))
+                               .hasMatch();
+    GMimeStream* stream =
+        g_mime_stream_mem_new_with_buffer(bytes.constData(), static_cast<size_t>(bytes.size()));
+    GMimeParser* parser = g_mime_parser_new_with_stream(stream);
+    GMimeMessage* parsed = g_mime_parser_construct_message(parser, nullptr);
+    if (parsed != nullptr) {
+        message.subject = QString::fromUtf8(g_mime_message_get_subject(parsed));
+        message.from = addresses(g_mime_message_get_from(parsed));
+        message.to = addresses(g_mime_message_get_to(parsed));
+        message.date = QString::fromUtf8(g_mime_object_get_header(GMIME_OBJECT(parsed), "Date"));
+        message.messageId = QString::fromUtf8(g_mime_message_get_message_id(parsed));
+        message.mimeVersion =
+            QString::fromUtf8(g_mime_object_get_header(GMIME_OBJECT(parsed), "MIME-Version"));
+        GMimeObject* top = g_mime_message_get_mime_part(parsed);
+        message.topType = top == nullptr ? QString() : partOf(top).mimeType;
+        if (top != nullptr && GMIME_IS_MULTIPART(top)) {
+            GMimeMultipart* multipart = GMIME_MULTIPART(top);
+            for (int i = 0; i < g_mime_multipart_get_count(multipart); ++i)
+                message.parts << partOf(g_mime_multipart_get_part(multipart, i));
+        }
+        g_object_unref(parsed);
+    }
+    g_object_unref(parser);
+    g_object_unref(stream);
+    return message;
+}
