@@ -50,6 +50,12 @@ protected:
     std::unique_ptr<SignalRecorder> recorder;
 };
 
+TEST(SmtpClientTransport, Port465IsImplicitTlsFromTheStart) {
+    EXPECT_TRUE(SmtpClient(QStringLiteral("smtp.example.org"), 465).isSSL());
+    EXPECT_FALSE(SmtpClient(QStringLiteral("smtp.example.org"), 587).isSSL());
+    EXPECT_FALSE(SmtpClient(QStringLiteral("smtp.example.org"), 25).isSSL());
+}
+
 TEST_F(SmtpClientProtocolTest, MultiLineRepliesSplitAcrossReadsAreReadWhole) {
     server.pieceSize = 7;
     server.greeting = "220-smtp.example.org ESMTP\r\n220-second line\r\n220 ready\r\n";
