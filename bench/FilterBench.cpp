@@ -31,6 +31,8 @@ public:
     void setTo(const QString&) override {}
     QString name() const override { return {}; }
     void setName(const QString&) override {}
+    QString webPageOrFile() const override { return {}; }
+    void setWebPageOrFile(const QString&) override {}
     void setStatus(const QString&) override {}
     void setProgressCounting(double, double, double) override {}
     void setProgressBusy() override {}

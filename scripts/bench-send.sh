@@ -13,7 +13,10 @@ cleanup() { [ -n "$sink" ] && kill "$sink" 2>/dev/null; rm -rf "$work"; }
 trap cleanup EXIT
 
 port=$(python3 -c 'import socket; s = socket.socket(); s.bind(("127.0.0.1", 0)); print(s.getsockname()[1])')
-/usr/sbin/smtp-sink 127.0.0.1:"$port" 256 &
+# smtp-sink drops its privileges to a user of its own when started as root.
+as_user=()
+[ "$(id -u)" -eq 0 ] && as_user=(-u nobody)
+/usr/sbin/smtp-sink "${as_user[@]}" 127.0.0.1:"$port" 256 &
 sink=$!
 
 export XDG_DATA_HOME="$work/data" XDG_CONFIG_HOME="$work/config"

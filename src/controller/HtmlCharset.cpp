@@ -1,5 +1,7 @@
 #include "controller/HtmlCharset.h"
 
+#include <algorithm>
+
 #include <QRegularExpression>
 #include <QStringDecoder>
 #include <QStringEncoder>
@@ -43,15 +45,37 @@ QString HtmlCharset::replaceUnencodable(const QString& text) const {
 }
 
 QString HtmlCharset::substituteUnencodable(const QString& text, Substitute substitute) const {
+    // Every copy of every message passes through here: most texts fit their set whole.
+    if (holdsAll(text))
+        return text;
     QString result;
     result.reserve(text.size());
-    for (const char32_t codePoint : text.toUcs4()) {
+    for (qsizetype i = 0; i < text.size();) {
+        const bool pair =
+            text.at(i).isHighSurrogate() && i + 1 < text.size() && text.at(i + 1).isLowSurrogate();
+        const qsizetype width = pair ? 2 : 1;
+        const char32_t codePoint =
+            pair ? QChar::surrogateToUcs4(text.at(i), text.at(i + 1)) : text.at(i).unicode();
         if (canHold(codePoint))
-            result += QString::fromUcs4(&codePoint, 1);
+            result += QStringView(text).mid(i, width);
         else
             result += substitute(codePoint);
+        i += width;
     }
     return result;
+}
+
+bool HtmlCharset::holdsAll(const QString& text) const {
+    if (charsetName == QLatin1String("utf-8"))
+        return true;
+    const char16_t limit = charsetName == QLatin1String("iso-8859-1") ? 0x100 : 0x80;
+    if (std::all_of(text.cbegin(), text.cend(), [limit](QChar c) { return c.unicode() < limit; }))
+        return true;
+    if (charsetName == QLatin1String("us-ascii") || charsetName == QLatin1String("iso-8859-1"))
+        return false;
+    QStringEncoder encoder(charsetName.toLatin1().constData());
+    const QByteArray bytes = encoder.encode(text);
+    return !encoder.hasError() && decode(bytes) == text;
 }
 
 QByteArray HtmlCharset::encode(const QString& text) const {

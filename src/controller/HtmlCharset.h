@@ -33,6 +33,8 @@ private:
 
     explicit HtmlCharset(QString name) : charsetName(std::move(name)) {}
     bool canHold(char32_t codePoint) const;
+    /** Whether the set holds every character of text, answered without a pass per character. */
+    bool holdsAll(const QString& text) const;
     QString substituteUnencodable(const QString& text, Substitute substitute) const;
 
     QString charsetName;

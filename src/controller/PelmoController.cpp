@@ -46,7 +46,9 @@ PelmoController::PelmoController(PelmoView& view, AddressBook& book, PasswordSto
                                  QObject* parent)
     : QObject(parent), window(view), addressBook(book), passwords(store),
       defaults(QStringLiteral("Orvale Software"), QStringLiteral("Pelmo")),
-      body(new QTextDocument(this)), attachments(new AttachmentsController(this)) {}
+      body(new QTextDocument(this)), attachments(new AttachmentsController(this)) {
+    connect(body, &QTextDocument::contentsChanged, this, [this] { plainBody = QString(); });
+}
 
 PelmoController::~PelmoController() = default;
 
@@ -64,7 +66,6 @@ void PelmoController::startUp() {
 }
 
 void PelmoController::applicationWillFinishLaunching() {
-    InitializeSuffixMap();
     StartLogging();
 }
 
@@ -209,7 +210,10 @@ int PelmoController::completionAction() {
 // Message content
 
 QString PelmoController::getMessage() {
-    return replaceTags(body->toPlainText());
+    // The body's text is exported once per change, not once per copy.
+    if (plainBody.isNull())
+        plainBody = body->toPlainText();
+    return replaceTags(plainBody);
 }
 
 QString PelmoController::getHTMLMessage() {
@@ -225,13 +229,48 @@ QString PelmoController::getHTMLMessage() {
 QString PelmoController::replaceTags(const QString& text) {
     if (text.isNull())
         return {};
-    QString copy = text;
+    // Every getter is asked for every copy, so that a missing value stops the message.
+    QStringList values;
+    bool braced = false;
     for (const Tag& tag : kTags) {
-        const QString value = (this->*tag.getter)();
-        if (!value.isNull())
-            copy.replace(QLatin1String(tag.text), value, Qt::CaseInsensitive);
+        values << (this->*tag.getter)();
+        braced = braced || values.last().contains(QLatin1Char('{')) ||
+                 values.last().contains(QLatin1Char('}'));
+    }
+    // Tag after tag is the rule; when no value holds a brace, no value can take part in
+    // another tag, and one pass over the text gives the same result.
+    return braced ? replaceTagsInTurn(text, values) : replaceTagsInOnePass(text, values);
+}
+
+QString PelmoController::replaceTagsInTurn(const QString& text, const QStringList& values) {
+    QString copy = text;
+    for (size_t i = 0; i < std::size(kTags); ++i) {
+        if (!values[i].isNull())
+            copy.replace(QLatin1String(kTags[i].text), values[i], Qt::CaseInsensitive);
     }
     return copy;
+}
+
+QString PelmoController::replaceTagsInOnePass(const QString& text, const QStringList& values) {
+    QString result;
+    result.reserve(text.size() + text.size() / 8);
+    qsizetype done = 0;
+    for (qsizetype at = text.indexOf(QLatin1Char('{')); at >= 0;
+         at = text.indexOf(QLatin1Char('{'), at + 1)) {
+        for (size_t i = 0; i < std::size(kTags); ++i) {
+            const QLatin1String tag(kTags[i].text);
+            if (values[i].isNull() ||
+                QStringView(text).mid(at, tag.size()).compare(tag, Qt::CaseInsensitive) != 0)
+                continue;
+            result += QStringView(text).mid(done, at - done);
+            result += values[i];
+            done = at + tag.size();
+            at = done - 1;
+            break;
+        }
+    }
+    result += QStringView(text).mid(done);
+    return result;
 }
 
 // Status, alerts and the log
@@ -467,6 +506,8 @@ QString PelmoController::getWebPageOrFile() {
     CText text("");
     text.append(bytes.constData(), bytes.size());
     statusMsg(QStringLiteral("Relinking web page..."));
+    // Reading the MIME database takes a tenth of a second: only runs with a page pay for it.
+    EnsureSuffixMap();
     relink(CString256(base.constData()), text);
     return QString::fromUtf8(text.buffer(), text.length());
 }

@@ -218,6 +218,8 @@ private:
     QString stringSetting(const char* key);
     int integerSetting(const char* key);
     QVariant setting(const char* key);
+    static QString replaceTagsInTurn(const QString& text, const QStringList& values);
+    static QString replaceTagsInOnePass(const QString& text, const QStringList& values);
     void recipientsDidChange();
     void startDelivery();
     void endRun();
@@ -227,6 +229,8 @@ private:
     PasswordStore& passwords;
     QSettings defaults;
     QTextDocument* body;
+    /** body as plain text, null until asked for after a change. */
+    QString plainBody;
     std::optional<QList<Person>> people;
     QStringList recipients;
     /** recipients case-folded, so that recipientsContains need not walk the list. */

@@ -52,6 +52,11 @@ uint32_t GetOurSignature() {
     return code;
 }
 
+void EnsureSuffixMap() {
+    if (gSuffixMap.count == 0)
+        InitializeSuffixMap();
+}
+
 void InitializeSuffixMap() {
     const QMimeDatabase database;
     QList<QMimeType> types = database.allMimeTypes();

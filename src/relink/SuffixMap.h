@@ -30,6 +30,9 @@ extern CMap<CString256, ICMapEntry> gSuffixMap;
  */
 void InitializeSuffixMap();
 
+/** Fills gSuffixMap unless it was filled before: for code that relinks on demand. */
+void EnsureSuffixMap();
+
 /** This program's four-character signature, as StrToFourCharCode reads it. */
 uint32_t GetOurSignature();
 
