@@ -17,12 +17,25 @@ inline void PrintTo(const QString& text, std::ostream* out) {
     *out << '"' << text.toStdString() << '"';
 }
 
-// A keyring that answers what the test put in it and counts the questions.
+// A keyring that answers what the test put in it and counts the questions; with answers
+// false it behaves as a machine without a keyring.
 class FakeKeyring : public PasswordStore {
 public:
     QString stored;
     int reads = 0;
-    QString readPassword(const QString&) override { return ++reads, stored; }
+    bool answers = true;
+    QString readPassword(const QString&) override { return ++reads, answers ? stored : QString(); }
+    bool writePassword(const QString&, const QString& password) override {
+        if (answers)
+            stored = password;
+        return answers;
+    }
+    bool deletePassword(const QString&) override {
+        if (answers)
+            stored.clear();
+        return answers;
+    }
+    bool keyringAnswers() const override { return answers; }
 };
 
 // A controller over a recording view, a fresh SQLite address book and empty settings.
