@@ -33,15 +33,25 @@ QByteArray HtmlCharset::exportDocument(const QTextDocument& document) const {
 }
 
 QString HtmlCharset::escapeUnencodable(const QString& text) const {
-    QString escaped;
-    escaped.reserve(text.size());
+    return substituteUnencodable(text, [](char32_t codePoint) {
+        return QStringLiteral("&#%1;").arg(static_cast<uint>(codePoint));
+    });
+}
+
+QString HtmlCharset::replaceUnencodable(const QString& text) const {
+    return substituteUnencodable(text, [](char32_t) { return QStringLiteral("?"); });
+}
+
+QString HtmlCharset::substituteUnencodable(const QString& text, Substitute substitute) const {
+    QString result;
+    result.reserve(text.size());
     for (const char32_t codePoint : text.toUcs4()) {
         if (canHold(codePoint))
-            escaped += QString::fromUcs4(&codePoint, 1);
+            result += QString::fromUcs4(&codePoint, 1);
         else
-            escaped += QStringLiteral("&#%1;").arg(static_cast<uint>(codePoint));
+            result += substitute(codePoint);
     }
-    return escaped;
+    return result;
 }
 
 QByteArray HtmlCharset::encode(const QString& text) const {

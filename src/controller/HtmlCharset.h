@@ -22,13 +22,18 @@ public:
     QByteArray exportDocument(const QTextDocument& document) const;
     /** text with what this set cannot hold replaced by numeric character references. */
     QString escapeUnencodable(const QString& text) const;
+    /** text with what this set cannot hold replaced by "?": for text that is not HTML. */
+    QString replaceUnencodable(const QString& text) const;
     /** text in this set; characters it cannot hold are lost, escape them first. */
     QByteArray encode(const QString& text) const;
     QString decode(const QByteArray& bytes) const;
 
 private:
+    using Substitute = QString (*)(char32_t codePoint);
+
     explicit HtmlCharset(QString name) : charsetName(std::move(name)) {}
     bool canHold(char32_t codePoint) const;
+    QString substituteUnencodable(const QString& text, Substitute substitute) const;
 
     QString charsetName;
 };

@@ -3,6 +3,8 @@
 #include "text/CString256.h"
 
 #include <QDateTime>
+#include <QFileInfo>
+#include <QMimeDatabase>
 
 #include <cstdio>
 #include <cstring>
@@ -166,4 +168,14 @@ QString DateDescription(const QDateTime& date) {
            QStringLiteral("%1%2")
                .arg(magnitude / 60, 2, 10, QLatin1Char('0'))
                .arg(magnitude % 60, 2, 10, QLatin1Char('0'));
+}
+
+QString MimeTypeForPath(const QString& path) {
+    const QString fileName = QFileInfo(path).fileName();
+    const qsizetype dot = fileName.lastIndexOf(QLatin1Char('.'));
+    // A leading dot marks a hidden file, not an extension; a trailing one names none.
+    if (dot <= 0 || dot == fileName.size() - 1)
+        return {};
+    const QList<QMimeType> types = QMimeDatabase().mimeTypesForFileName(fileName);
+    return types.isEmpty() ? QString() : types.first().name();
 }

@@ -50,6 +50,13 @@ void URLSafeEncode(char* out, unsigned char c);
  */
 void ElapsedTimeMessage(uint32_t seconds, CString256& text);
 
+/**
+ * The MIME type the desktop's MIME database gives a file of this name ("application/pdf" for
+ * "report.pdf"), looked up by name only (the file need not exist). Null when the name has no
+ * extension or the database does not know it: never a made-up type.
+ */
+QString MimeTypeForPath(const QString& path);
+
 /** A date in the program's one textual form, local time: "2024-05-01 14:03:22 +0200". */
 QString DateDescription(const QDateTime& date);
 

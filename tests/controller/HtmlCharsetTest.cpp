@@ -25,6 +25,15 @@ TEST(HtmlCharset, EscapesCharactersOutsideTheSet) {
               QString::fromUtf8("a &#233; &#165; 日 &#128512;"));
 }
 
+TEST(HtmlCharset, ReplacesCharactersOutsideTheSetByQuestionMarks) {
+    const QString text = QString::fromUtf8("a é ¥ 日 😀");
+    EXPECT_EQ(HtmlCharset::forIndex(0).replaceUnencodable(text), text);
+    EXPECT_EQ(HtmlCharset::forIndex(1).replaceUnencodable(text), QStringLiteral("a ? ? ? ?"));
+    EXPECT_EQ(HtmlCharset::forIndex(2).replaceUnencodable(text), QString::fromUtf8("a é ¥ ? ?"));
+    // One "?" per character, a surrogate pair included.
+    EXPECT_EQ(HtmlCharset::forIndex(3).replaceUnencodable(text), QString::fromUtf8("a ? ? 日 ?"));
+}
+
 TEST(HtmlCharset, ExportedBytesAreInTheSet) {
     QTextDocument document;
     document.setPlainText(QString::fromUtf8("Café"));

@@ -171,6 +171,35 @@ TEST(TextUtilities, MoveArrayItem) {
     EXPECT_EQ(numbers, (QList<int>{1, 3, 2}));
 }
 
+TEST(TextUtilities, MimeTypeForPathAsksTheMimeDatabaseByExtension) {
+    struct Row {
+        const char* name;
+        const char* path;
+        const char* expected; // null: no type
+    };
+    const Row rows[] = {
+        {"pdf", "/home/ada/Documents/report.pdf", "application/pdf"},
+        {"upper-case extension", "/tmp/PHOTO.JPG", "image/jpeg"},
+        {"relative path", "notes.txt", "text/plain"},
+        {"double extension", "/tmp/backup.tar.gz", "application/x-compressed-tar"},
+        {"no extension, though the database knows the name", "/src/Makefile", nullptr},
+        {"dot only in a folder name", "/tmp/v1.2/README", nullptr},
+        {"hidden file", "/home/ada/.profile", nullptr},
+        {"trailing dot", "/tmp/report.", nullptr},
+        {"unknown extension", "/tmp/data.zzqx", nullptr},
+        {"folder path", "/tmp/folder.d/", nullptr},
+        {"empty", "", nullptr},
+    };
+    for (const Row& row : rows) {
+        const QString type = MimeTypeForPath(QString::fromUtf8(row.path));
+        if (row.expected == nullptr) {
+            EXPECT_TRUE(type.isNull()) << row.name << ": " << type.toStdString();
+        } else {
+            EXPECT_EQ(type.toStdString(), row.expected) << row.name;
+        }
+    }
+}
+
 } // namespace
 
 TEST(DateDescription, DateTimeAndNumericOffset) {

@@ -1,0 +1,235 @@
+#include "smtp/MessageAssembly.h"
+
+#include "controller/HtmlCharset.h"
+#include "smtp/QuotedPrintable.h"
+#include "util/LocalizedStrings.h"
+#include "util/PelmoException.h"
+#include "util/TextUtilities.h"
+
+#include <QFile>
+#include <QFileInfo>
+#include <QUrl>
+
+#include <gmime/gmime.h>
+
+#include <algorithm>
+
+namespace {
+
+struct GObjectUnref {
+    void operator()(gpointer object) const { g_object_unref(object); }
+};
+template <class T>
+using GPointer = std::unique_ptr<T, GObjectUnref>;
+
+struct FormatOptionsFree {
+    void operator()(GMimeFormatOptions* options) const { g_mime_format_options_free(options); }
+};
+
+GMimeMessage* newMessage() {
+    [[maybe_unused]] static const bool initialised = [] {
+        g_mime_init();
+        return true;
+    }();
+    return g_mime_message_new(TRUE);
+}
+
+bool breaksHeaderLine(QChar c) {
+    return c == QLatin1Char('\r') || c == QLatin1Char('\n') || c == QChar(u'\0');
+}
+
+bool breaksHeader(const QString& text) {
+    return std::any_of(text.begin(), text.end(), breaksHeaderLine);
+}
+
+// RFC 5322 2.2: a header field is one line; a CR or LF in a value would end it and could start
+// a header of the sender's making, and a NUL would cut GMime's C string short.
+QByteArray headerText(const QString& text, const QString& what) {
+    if (breaksHeader(text))
+        throw PelmoException(QStringLiteral("BadHeaderText"),
+                             LocalizedString("The %1 holds a line break or a null character, "
+                                             "which cannot go into a mail header.")
+                                 .arg(what));
+    return text.toUtf8();
+}
+
+QString attachmentDescription(QString fileName) {
+    std::replace_if(fileName.begin(), fileName.end(), breaksHeaderLine, QLatin1Char(' '));
+    return LocalizedString("name of the attachment \"%1\"").arg(fileName);
+}
+
+// RFC 5322 3.6.4: GMime's unique left part and the sender's domain, as mailers do; an address
+// without a usable domain (a local user, a domain literal) falls back to localhost.
+QByteArray messageIdDomain(const QString& address) {
+    const qsizetype at = address.lastIndexOf(QLatin1Char('@'));
+    const QByteArray domain = at < 0 ? QByteArray() : QUrl::toAce(address.mid(at + 1));
+    const bool usable = !domain.isEmpty() && std::all_of(domain.begin(), domain.end(), [](char c) {
+        return isHiorLoAlpha(static_cast<unsigned char>(c)) ||
+               isDig(static_cast<unsigned char>(c)) || c == '-' || c == '.';
+    });
+    return usable ? domain : QByteArrayLiteral("localhost");
+}
+
+// The charset parameter for each "selectedCharacterSet" index; other indexes name none.
+const char* charsetParameter(int characterSetIndex) {
+    switch (characterSetIndex) {
+    case 0:
+        return "utf-8";
+    case 1:
+        return "us-ascii";
+    case 2:
+        return "iso-8859-1";
+    case 3:
+        return "shift-jis";
+    default:
+        return nullptr;
+    }
+}
+
+// RFC 2046 4.1.1: text travels with CRLF line breaks, whatever the editor or page used.
+QString withCrlfLineEnds(QString text) {
+    text.replace(QLatin1String("\r\n"), QLatin1String("\n"));
+    text.replace(QLatin1Char('\r'), QLatin1Char('\n'));
+    return text.replace(QLatin1Char('\n'), QLatin1String("\r\n"));
+}
+
+// HTML keeps every character as a numeric character reference; the controller's HTML already
+// holds them, a downloaded page may not. Other text can only mark the loss.
+QByteArray bodyBytes(const QString& text, const QString& mimeType, int characterSetIndex) {
+    const HtmlCharset charset = HtmlCharset::forIndex(characterSetIndex);
+    const QString canonical = withCrlfLineEnds(text);
+    const bool html = mimeType.compare(QLatin1String("text/html"), Qt::CaseInsensitive) == 0;
+    return charset.encode(html ? charset.escapeUnencodable(canonical)
+                               : charset.replaceUnencodable(canonical));
+}
+
+void setContentType(GMimePart* part, const QByteArray& mimeType) {
+    const GPointer<GMimeContentType> type(g_mime_content_type_parse(nullptr, mimeType.constData()));
+    g_mime_object_set_content_type(GMIME_OBJECT(part), type.get());
+}
+
+void setContent(GMimePart* part, const QByteArray& bytes, GMimeContentEncoding encodedAs) {
+    const GPointer<GMimeStream> stream(
+        g_mime_stream_mem_new_with_buffer(bytes.constData(), static_cast<size_t>(bytes.size())));
+    const GPointer<GMimeDataWrapper> content(
+        g_mime_data_wrapper_new_with_stream(stream.get(), encodedAs));
+    g_mime_part_set_content(part, content.get());
+}
+
+} // namespace
+
+struct MessageAssembly::Message {
+    GPointer<GMimeMessage> mime{newMessage()};
+    GPointer<GMimeMultipart> parts{g_mime_multipart_new_with_subtype("mixed")};
+    QString sender;
+    QString recipient;
+
+    void setMailbox(GMimeAddressType type, const QString& name, const QString& address,
+                    const QString& nameWhat, const QString& addressWhat);
+};
+
+// Both checks come before the list is touched, so a refused mailbox leaves the old one.
+void MessageAssembly::Message::setMailbox(GMimeAddressType type, const QString& name,
+                                          const QString& address, const QString& nameWhat,
+                                          const QString& addressWhat) {
+    const QByteArray nameText = headerText(name.trimmed(), nameWhat);
+    const QByteArray addressText = headerText(address, addressWhat);
+    if (address.isEmpty())
+        throw PelmoException(QStringLiteral("BadAddress"),
+                             LocalizedString("The %1 is empty.").arg(addressWhat));
+    InternetAddressList* list = g_mime_message_get_addresses(mime.get(), type);
+    internet_address_list_clear(list);
+    const GPointer<InternetAddress> mailbox(internet_address_mailbox_new(
+        nameText.isEmpty() ? nullptr : nameText.constData(), addressText.constData()));
+    internet_address_list_add(list, mailbox.get());
+}
+
+MessageAssembly::MessageAssembly() : message(std::make_unique<Message>()) {
+    g_mime_multipart_set_boundary(message->parts.get(), nullptr);
+    g_mime_message_set_mime_part(message->mime.get(), GMIME_OBJECT(message->parts.get()));
+    // RFC 5322 3.6.1: the time the message was made, with the local offset.
+    GDateTime* now = g_date_time_new_now_local();
+    g_mime_message_set_date(message->mime.get(), now);
+    g_date_time_unref(now);
+}
+
+MessageAssembly::~MessageAssembly() = default;
+
+void MessageAssembly::setSubject(const QString& subject) {
+    // No charset given: GMime picks the smallest that holds the text for RFC 2047 words.
+    g_mime_message_set_subject(
+        message->mime.get(), headerText(subject, LocalizedString("subject")).constData(), nullptr);
+}
+
+void MessageAssembly::setFrom(const QString& name, const QString& address) {
+    message->setMailbox(GMIME_ADDRESS_TYPE_FROM, name, address, LocalizedString("sender's name"),
+                        LocalizedString("sender's address"));
+    message->sender = address;
+    char* id = g_mime_utils_generate_message_id(messageIdDomain(address).constData());
+    g_mime_message_set_message_id(message->mime.get(), id);
+    g_free(id);
+}
+
+void MessageAssembly::setTo(const QString& name, const QString& address) {
+    message->setMailbox(GMIME_ADDRESS_TYPE_TO, name, address, LocalizedString("recipient's name"),
+                        LocalizedString("recipient's address"));
+    message->recipient = address;
+}
+
+void MessageAssembly::addBodyPart(const QString& text, const QString& mimeType,
+                                  int characterSetIndex) {
+    const GPointer<GMimePart> part(g_mime_part_new());
+    setContentType(part.get(), headerText(mimeType, LocalizedString("content type")));
+    if (const char* charset = charsetParameter(characterSetIndex))
+        g_mime_object_set_content_type_parameter(GMIME_OBJECT(part.get()), "charset", charset);
+    setContent(part.get(), bodyBytes(text, mimeType, characterSetIndex),
+               GMIME_CONTENT_ENCODING_DEFAULT);
+    g_mime_part_set_content_encoding(part.get(), GMIME_CONTENT_ENCODING_BASE64);
+    g_mime_multipart_add(message->parts.get(), GMIME_OBJECT(part.get()));
+}
+
+bool MessageAssembly::addAttachment(const QString& path) {
+    QFile file(path);
+    if (!file.open(QIODevice::ReadOnly))
+        return false;
+    const QByteArray bytes = file.readAll();
+    if (file.error() != QFileDevice::NoError)
+        return false;
+    const QString fileName = QFileInfo(path).fileName();
+    const QByteArray name = headerText(fileName, attachmentDescription(fileName));
+    const GPointer<GMimePart> part(g_mime_part_new());
+    if (const QString type = MimeTypeForPath(path); !type.isNull())
+        setContentType(part.get(), type.toUtf8());
+    g_mime_part_set_filename(part.get(), name.constData());
+    // Encoded here rather than by GMime, whose encoder writes LF bytes as line breaks, which
+    // a reader decodes as CRLF: binary files would not arrive as they left.
+    setContent(part.get(), EncodeQuotedPrintable(bytes), GMIME_CONTENT_ENCODING_QUOTEDPRINTABLE);
+    g_mime_part_set_content_encoding(part.get(), GMIME_CONTENT_ENCODING_QUOTEDPRINTABLE);
+    g_mime_multipart_add(message->parts.get(), GMIME_OBJECT(part.get()));
+    return true;
+}
+
+QByteArray MessageAssembly::toBytes() const {
+    if (message->sender.isEmpty() || message->recipient.isEmpty())
+        throw PelmoException(QStringLiteral("IncompleteMessage"),
+                             LocalizedString("The message has no sender or no recipient."));
+    const std::unique_ptr<GMimeFormatOptions, FormatOptionsFree> options(
+        g_mime_format_options_new());
+    g_mime_format_options_set_newline_format(options.get(), GMIME_NEWLINE_FORMAT_DOS);
+    // RFC 2231 3, 4: long and non-ASCII file names split and percent-encoded.
+    g_mime_format_options_set_param_encoding_method(options.get(),
+                                                    GMIME_PARAM_ENCODING_METHOD_RFC2231);
+    const GPointer<GMimeStream> stream(g_mime_stream_mem_new());
+    g_mime_object_write_to_stream(GMIME_OBJECT(message->mime.get()), options.get(), stream.get());
+    const GByteArray* bytes = g_mime_stream_mem_get_byte_array(GMIME_STREAM_MEM(stream.get()));
+    return QByteArray(reinterpret_cast<const char*>(bytes->data),
+                      static_cast<qsizetype>(bytes->len));
+}
+
+QString MessageAssembly::envelopeSender() const {
+    return message->sender;
+}
+
+QStringList MessageAssembly::envelopeRecipients() const {
+    return message->recipient.isEmpty() ? QStringList() : QStringList{message->recipient};
+}
