@@ -1,6 +1,9 @@
 #include "gui/MainWindow.h"
 
+#include "attachments/AttachmentsController.h"
 #include "controller/PelmoController.h"
+#include "gui/AlertBox.h"
+#include "gui/AttachmentsWindow.h"
 #include "gui/FormattingToolBar.h"
 #include "gui/PeoplePicker.h"
 #include "gui/PreferencesDialog.h"
@@ -15,7 +18,6 @@
 #include <QLabel>
 #include <QLineEdit>
 #include <QMenuBar>
-#include <QMessageBox>
 #include <QProgressBar>
 #include <QPushButton>
 #include <QShortcut>
@@ -54,6 +56,11 @@ MainWindow::MainWindow(AddressBook& addressBook, PasswordStore& passwords, QWidg
 
     m_recipients = new RecipientsWindow(*m_controller, this);
     m_picker = new PeoplePicker(addressBook, this);
+    m_attachments = new AttachmentsController(this);
+    m_attachmentsWindow = new AttachmentsWindow(*m_attachments, this);
+    // Every message the controller builds carries the list as it stands.
+    connect(m_attachments, &AttachmentsController::attachmentsChanged, m_controller.get(),
+            [this] { m_controller->setAttachments(m_attachments->getAttachments()); });
     createActions();
     connectPicker();
     showProgress();
@@ -61,8 +68,11 @@ MainWindow::MainWindow(AddressBook& addressBook, PasswordStore& passwords, QWidg
 }
 
 MainWindow::~MainWindow() {
-    // The editor shows the controller's document, which goes with the controller before the
-    // base class would delete the widgets.
+    // The editor and the tables show what the controllers hold, and the controllers go first
+    // (the mailing controller as a member, the attachments list as an earlier child): the
+    // widgets that show them go before.
+    delete m_attachmentsWindow;
+    delete m_recipients;
     delete centralWidget();
 }
 
@@ -152,6 +162,10 @@ void MainWindow::createActions() {
     console->setObjectName(QStringLiteral("consoleAction"));
     console->setToolTip(LocalizedStringNS("Show the activity log"));
     connect(console, &QAction::triggered, m_controller.get(), &PelmoController::openConsole);
+    auto* attachments = new QAction(icon("mail-attachment", QStyle::SP_FileIcon),
+                                    LocalizedStringNS("Attachments"), this);
+    attachments->setObjectName(QStringLiteral("attachmentsAction"));
+    connect(attachments, &QAction::triggered, this, &MainWindow::showAttachments);
     auto* recipients = new QAction(LocalizedStringNS("Sent Recipients"), this);
     connect(recipients, &QAction::triggered, this, &MainWindow::showRecipientsWindow);
     auto* quit = new QAction(LocalizedStringNS("Quit"), this);
@@ -162,14 +176,14 @@ void MainWindow::createActions() {
     tools->setObjectName(QStringLiteral("tools"));
     tools->setMovable(false);
     tools->setToolButtonStyle(Qt::ToolButtonTextBesideIcon);
-    tools->addActions({preferences, addresses, console});
+    tools->addActions({preferences, addresses, attachments, console});
 
     QMenu* file = menuBar()->addMenu(LocalizedStringNS("&File"));
     file->addAction(preferences);
     file->addSeparator();
     file->addAction(quit);
     QMenu* window = menuBar()->addMenu(LocalizedStringNS("&Window"));
-    window->addActions({addresses, recipients, console});
+    window->addActions({addresses, attachments, recipients, console});
 }
 
 void MainWindow::connectPicker() {
@@ -283,12 +297,7 @@ void MainWindow::reloadRecipients() {
 }
 
 void MainWindow::alert(const QString& title, const QString& informativeText) {
-    auto* box = new QMessageBox(QMessageBox::Warning, LocalizedStringNS("Pelmo"), title,
-                                QMessageBox::Ok, this);
-    box->setInformativeText(informativeText);
-    box->setWindowModality(Qt::WindowModal);
-    box->setAttribute(Qt::WA_DeleteOnClose);
-    box->open();
+    openAlert(this, title, informativeText);
 }
 
 void MainWindow::beep() {
@@ -299,6 +308,12 @@ void MainWindow::showPeoplePicker() {
     m_picker->show();
     m_picker->raise();
     m_picker->activateWindow();
+}
+
+void MainWindow::showAttachments() {
+    m_attachmentsWindow->show();
+    m_attachmentsWindow->raise();
+    m_attachmentsWindow->activateWindow();
 }
 
 void MainWindow::showPreferences() {

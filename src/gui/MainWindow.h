@@ -7,6 +7,8 @@
 #include <memory>
 
 class AddressBook;
+class AttachmentsController;
+class AttachmentsWindow;
 class PasswordStore;
 class PelmoController;
 class PeoplePicker;
@@ -21,14 +23,15 @@ class RecipientsWindow;
 /**
  * Pelmo's window: the message editor with its formatting tool bar, the Subject, recipient and
  * web page fields, the Send/Stop button, the progress bar and the status line, and the buttons
- * that open the preferences, the people picker, the activity log and the attachments.
+ * that open the preferences, the people picker, the attachments and the activity log.
  *
  * The window owns its controller and drives it only by forwarding: each button calls the
  * controller's action, each user edit of a field is reported with textDidChange, and the
  * controller shows its progress through the PelmoView calls. The editor shares the
- * controller's message document. The people picker, the sent-recipients window and the
- * preferences dialog are separate windows owned by this one. The address book and the
- * password store are not owned and must outlive the window.
+ * controller's message document. The window owns the attachments list and hands each change
+ * of it to the controller. The people picker, the sent-recipients window, the attachments
+ * window and the preferences dialog are separate windows owned by this one. The address book
+ * and the password store are not owned and must outlive the window.
  */
 class MainWindow : public QMainWindow, public PelmoView {
     Q_OBJECT
@@ -40,6 +43,8 @@ public:
     PelmoController& controller() const { return *m_controller; }
     PeoplePicker& peoplePicker() const { return *m_picker; }
     RecipientsWindow& recipientsWindow() const { return *m_recipients; }
+    AttachmentsController& attachments() const { return *m_attachments; }
+    AttachmentsWindow& attachmentsWindow() const { return *m_attachmentsWindow; }
 
     QString subject() const override;
     void setSubject(const QString& text) override;
@@ -66,6 +71,8 @@ public:
 
     /** Brings the people picker to the front. */
     void showPeoplePicker();
+    /** Brings the attachments window to the front. */
+    void showAttachments();
     /** Opens the preferences as a window-modal dialog. */
     void showPreferences();
 
@@ -92,6 +99,8 @@ private:
     PeoplePicker* m_picker = nullptr;
     RecipientsWindow* m_recipients = nullptr;
     PreferencesDialog* m_preferences = nullptr;
+    AttachmentsController* m_attachments = nullptr;
+    AttachmentsWindow* m_attachmentsWindow = nullptr;
     /** The progress indicator's state: a counting bar, or a busy one that may be animated. */
     bool m_busy = true;
     bool m_animating = false;

@@ -1,6 +1,7 @@
 #include "gui/PeoplePicker.h"
 
 #include "addressbook/AddressBook.h"
+#include "gui/AlertBox.h"
 #include "gui/PersonDialog.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
@@ -267,13 +268,7 @@ void PeoplePicker::change(const std::function<void()>& edit) {
 }
 
 void PeoplePicker::showFailure(const PelmoException& failure) {
-    auto* box = new QMessageBox(QMessageBox::Warning, windowTitle(),
-                                LocalizedStringNS("The address book was not changed."),
-                                QMessageBox::Ok, this);
-    box->setInformativeText(failure.reason());
-    box->setWindowModality(Qt::WindowModal);
-    box->setAttribute(Qt::WA_DeleteOnClose);
-    box->open();
+    openAlert(this, LocalizedStringNS("The address book was not changed."), failure.reason());
 }
 
 void PeoplePicker::askForGroupName(const QString& title, const QString& initial,

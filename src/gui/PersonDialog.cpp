@@ -1,6 +1,7 @@
 #include "gui/PersonDialog.h"
 
 #include "addressbook/AddressBook.h"
+#include "gui/AlertBox.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
 
@@ -11,7 +12,6 @@
 #include <QHeaderView>
 #include <QLineEdit>
 #include <QListWidget>
-#include <QMessageBox>
 #include <QPushButton>
 #include <QRadioButton>
 #include <QSet>
@@ -173,13 +173,7 @@ void PersonDialog::accept() {
     try {
         save();
     } catch (const PelmoException& failure) {
-        auto* box =
-            new QMessageBox(QMessageBox::Warning, windowTitle(),
-                            LocalizedStringNS("The person was not saved."), QMessageBox::Ok, this);
-        box->setInformativeText(failure.reason());
-        box->setWindowModality(Qt::WindowModal);
-        box->setAttribute(Qt::WA_DeleteOnClose);
-        box->open();
+        openAlert(this, LocalizedStringNS("The person was not saved."), failure.reason());
         return;
     }
     Q_EMIT saved(m_person.id);
