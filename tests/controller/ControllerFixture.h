@@ -38,17 +38,8 @@ public:
     bool keyringAnswers() const override { return answers; }
 };
 
-// A controller over a recording view, a fresh SQLite address book and empty settings.
-class ControllerFixture : public ::testing::Test {
-protected:
-    void SetUp() override {
-        ASSERT_TRUE(folder.isValid());
-        settings().clear();
-        settings().sync();
-        book = std::make_unique<AddressBook>(folder.filePath(QStringLiteral("book.sqlite")));
-        controller = std::make_unique<PelmoController>(view, *book, keyring);
-    }
-
+// The settings file the controller reads, for tests to write.
+struct TestSettings {
     static QSettings& settings() {
         static QSettings store(QStringLiteral("Orvale Software"), QStringLiteral("Pelmo"));
         return store;
@@ -56,6 +47,18 @@ protected:
     static void set(const char* key, const QVariant& value) {
         settings().setValue(QLatin1String(key), value);
         settings().sync();
+    }
+};
+
+// A controller over a recording view, a fresh SQLite address book and empty settings.
+class ControllerFixture : public ::testing::Test, protected TestSettings {
+protected:
+    void SetUp() override {
+        ASSERT_TRUE(folder.isValid());
+        settings().clear();
+        settings().sync();
+        book = std::make_unique<AddressBook>(folder.filePath(QStringLiteral("book.sqlite")));
+        controller = std::make_unique<PelmoController>(view, *book, keyring);
     }
 
     QTemporaryDir folder;

@@ -1,10 +1,10 @@
 #include "gui/AttachmentsWindow.h"
+#include "DesktopStandIn.h"
 #include "GuiFixture.h"
 #include "attachments/AttachmentsController.h"
 #include "gui/AttachmentsModel.h"
 
 #include <QAction>
-#include <QDesktopServices>
 #include <QDir>
 #include <QDropEvent>
 #include <QFile>
@@ -16,20 +16,6 @@
 #include <memory>
 
 namespace {
-
-// Stands in for the desktop: QDesktopServices hands file URLs to it instead.
-class Desktop : public QObject {
-    Q_OBJECT
-
-public:
-    Desktop() { QDesktopServices::setUrlHandler(QStringLiteral("file"), this, "open"); }
-    ~Desktop() override { QDesktopServices::unsetUrlHandler(QStringLiteral("file")); }
-
-    QList<QUrl> opened;
-
-public Q_SLOTS:
-    void open(const QUrl& url) { opened += url; }
-};
 
 // The attachments window with real drags dropped on its table: the view's own drag events
 // carrying real QMimeData, file URLs as a file manager sends them or the table's private row
@@ -202,7 +188,7 @@ TEST_F(AttachmentsTable, RemoveTakesTheSelectedRowsOrAll) {
 TEST_F(AttachmentsTable, DoubleClickOpensTheFileOnTheDesktop) {
     const QString a = file("a.txt"), b = file("b.txt");
     fill({a, b});
-    Desktop desktop;
+    DesktopStandIn desktop;
     const QPoint row1 = table->visualRect(model().index(1, 0)).center();
     // A double click is a click and then the second press, as the platform delivers it.
     QTest::mouseClick(table->viewport(), Qt::LeftButton, Qt::NoModifier, row1);
@@ -211,5 +197,3 @@ TEST_F(AttachmentsTable, DoubleClickOpensTheFileOnTheDesktop) {
 }
 
 } // namespace
-
-#include "AttachmentsWindowTest.moc"

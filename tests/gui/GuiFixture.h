@@ -21,7 +21,7 @@
 
 // The real main window over a fresh address book, empty settings and a fake keyring, shown on
 // the offscreen platform.
-class GuiFixture : public ::testing::Test {
+class GuiFixture : public ::testing::Test, protected TestSettings {
 protected:
     void SetUp() override {
         ASSERT_TRUE(folder.isValid());
@@ -38,15 +38,6 @@ protected:
         window.reset();
         // Message boxes and dialogs that deleted themselves later go now.
         QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
-    }
-
-    static QSettings& settings() {
-        static QSettings store(QStringLiteral("Orvale Software"), QStringLiteral("Pelmo"));
-        return store;
-    }
-    static void set(const char* key, const QVariant& value) {
-        settings().setValue(QLatin1String(key), value);
-        settings().sync();
     }
 
     PelmoController& controller() const { return window->controller(); }
