@@ -1,8 +1,10 @@
 #include "gui/FormattingToolBar.h"
 
+#include "gui/FormatIcons.h"
 #include "util/LocalizedStrings.h"
 
 #include <QActionGroup>
+#include <QApplication>
 #include <QColorDialog>
 #include <QComboBox>
 #include <QFontComboBox>
@@ -18,16 +20,23 @@ namespace {
 struct AlignmentTool {
     Qt::Alignment alignment;
     const char* themeIcon;
-    const char* fallbackText;
-    const char* toolTip;
+    const char* text;
 };
 
 constexpr AlignmentTool kAlignments[] = {
-    {Qt::AlignLeft | Qt::AlignAbsolute, "format-justify-left", "Left", "Align Left"},
-    {Qt::AlignHCenter, "format-justify-center", "Center", "Center"},
-    {Qt::AlignRight | Qt::AlignAbsolute, "format-justify-right", "Right", "Align Right"},
-    {Qt::AlignJustify, "format-justify-fill", "Justify", "Justify"},
+    {Qt::AlignLeft | Qt::AlignAbsolute, "format-justify-left", "Align Left"},
+    {Qt::AlignHCenter, "format-justify-center", "Center"},
+    {Qt::AlignRight | Qt::AlignAbsolute, "format-justify-right", "Align Right"},
+    {Qt::AlignJustify, "format-justify-fill", "Justify"},
 };
+
+QFont styled(bool bold, bool italic, bool underline) {
+    QFont font = QApplication::font();
+    font.setBold(bold);
+    font.setItalic(italic);
+    font.setUnderline(underline);
+    return font;
+}
 
 } // namespace
 
@@ -46,11 +55,9 @@ FormattingToolBar::FormattingToolBar(QTextEdit* editor, QWidget* parent)
     showParagraph();
 }
 
-QAction* FormattingToolBar::addToggle(const char* themeIcon, const char* fallbackText,
-                                      const char* toolTip, const QKeySequence& shortcut) {
-    QAction* action =
-        addAction(QIcon::fromTheme(QLatin1String(themeIcon)), LocalizedStringNS(fallbackText));
-    action->setToolTip(LocalizedStringNS(toolTip));
+QAction* FormattingToolBar::addToggle(const QIcon& icon, const char* text,
+                                      const QKeySequence& shortcut) {
+    QAction* action = addAction(icon, LocalizedStringNS(text));
     action->setShortcut(shortcut);
     action->setCheckable(true);
     return action;
@@ -82,36 +89,39 @@ void FormattingToolBar::addFontTools() {
 }
 
 void FormattingToolBar::addStyleTools() {
-    m_bold = addToggle("format-text-bold", "Bold", "Bold", QKeySequence::Bold);
+    m_bold =
+        addToggle(letterIcon("format-text-bold", QStringLiteral("B"), styled(true, false, false)),
+                  "Bold", QKeySequence::Bold);
     connect(m_bold, &QAction::triggered, this, [this](bool on) {
         QTextCharFormat format;
         format.setFontWeight(on ? QFont::Bold : QFont::Normal);
         mergeFormat(format);
     });
-    m_italic = addToggle("format-text-italic", "Italic", "Italic", QKeySequence::Italic);
+    m_italic =
+        addToggle(letterIcon("format-text-italic", QStringLiteral("I"), styled(false, true, false)),
+                  "Italic", QKeySequence::Italic);
     connect(m_italic, &QAction::triggered, this, [this](bool on) {
         QTextCharFormat format;
         format.setFontItalic(on);
         mergeFormat(format);
     });
-    m_underline =
-        addToggle("format-text-underline", "Underline", "Underline", QKeySequence::Underline);
+    m_underline = addToggle(
+        letterIcon("format-text-underline", QStringLiteral("U"), styled(false, false, true)),
+        "Underline", QKeySequence::Underline);
     connect(m_underline, &QAction::triggered, this, [this](bool on) {
         QTextCharFormat format;
         format.setFontUnderline(on);
         mergeFormat(format);
     });
-    QAction* color = addAction(QIcon::fromTheme(QStringLiteral("format-text-color")),
-                               LocalizedStringNS("Color"));
-    color->setToolTip(LocalizedStringNS("Text Color"));
-    connect(color, &QAction::triggered, this, &FormattingToolBar::chooseColor);
+    m_color = addAction(textColorIcon(m_editor->textColor()), LocalizedStringNS("Text Color"));
+    connect(m_color, &QAction::triggered, this, &FormattingToolBar::chooseColor);
 }
 
 void FormattingToolBar::addParagraphTools() {
     m_alignment = new QActionGroup(this);
     for (const AlignmentTool& tool : kAlignments) {
         QAction* action =
-            addToggle(tool.themeIcon, tool.fallbackText, tool.toolTip, QKeySequence());
+            addToggle(alignmentIcon(tool.themeIcon, tool.alignment), tool.text, QKeySequence());
         action->setData(static_cast<int>(tool.alignment));
         m_alignment->addAction(action);
     }
@@ -119,15 +129,13 @@ void FormattingToolBar::addParagraphTools() {
         m_editor->setAlignment(Qt::Alignment(action->data().toInt()));
     });
     addSeparator();
-    m_list = addToggle("format-list-unordered", "List", "Bulleted List", QKeySequence());
+    m_list = addToggle(bulletListIcon("format-list-unordered"), "Bulleted List", QKeySequence());
     connect(m_list, &QAction::triggered, this, &FormattingToolBar::toggleList);
 }
 
+// Applies to the selection, or without one to what is typed next: a word just typed keeps
+// its format when a style is switched off after it.
 void FormattingToolBar::mergeFormat(const QTextCharFormat& format) {
-    QTextCursor cursor = m_editor->textCursor();
-    if (!cursor.hasSelection())
-        cursor.select(QTextCursor::WordUnderCursor);
-    cursor.mergeCharFormat(format);
     m_editor->mergeCurrentCharFormat(format);
     m_editor->setFocus();
 }
@@ -165,6 +173,7 @@ void FormattingToolBar::showCharFormat(const QTextCharFormat& format) {
     m_bold->setChecked(font.bold());
     m_italic->setChecked(font.italic());
     m_underline->setChecked(font.underline());
+    m_color->setIcon(textColorIcon(m_editor->textColor()));
 }
 
 void FormattingToolBar::showParagraph() {

@@ -11,8 +11,8 @@ class QTextEdit;
 
 /**
  * The message editor's formatting tools: font, size, bold, italic, underline, colour,
- * alignment and bulleted lists. They act on the editor's selection (or the word under the
- * cursor) and follow the format at the cursor. The editor is not owned.
+ * alignment and bulleted lists. They act on the editor's selection, or without one on what is
+ * typed next, and follow the format at the cursor. The editor is not owned.
  */
 class FormattingToolBar : public QToolBar {
     Q_OBJECT
@@ -21,8 +21,7 @@ public:
     explicit FormattingToolBar(QTextEdit* editor, QWidget* parent = nullptr);
 
 private:
-    QAction* addToggle(const char* themeIcon, const char* fallbackText, const char* toolTip,
-                       const QKeySequence& shortcut);
+    QAction* addToggle(const QIcon& icon, const char* text, const QKeySequence& shortcut);
     void addFontTools();
     void addStyleTools();
     void addParagraphTools();
@@ -38,6 +37,7 @@ private:
     QAction* m_bold = nullptr;
     QAction* m_italic = nullptr;
     QAction* m_underline = nullptr;
+    QAction* m_color = nullptr;
     QAction* m_list = nullptr;
     QActionGroup* m_alignment = nullptr;
 };

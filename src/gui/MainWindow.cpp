@@ -129,6 +129,10 @@ QWidget* MainWindow::createSendRow() {
     m_spinner->setObjectName(QStringLiteral("spinner"));
     m_spinner->setTextVisible(false);
     m_spinner->setFixedWidth(160);
+    // Hidden while idle, without the status line and the button moving when it shows.
+    QSizePolicy keepPlace = m_spinner->sizePolicy();
+    keepPlace.setRetainSizeWhenHidden(true);
+    m_spinner->setSizePolicy(keepPlace);
     m_sendButton = new QPushButton(LocalizedStringNS("Send"));
     m_sendButton->setObjectName(QStringLiteral("sendButton"));
     m_sendButton->setDefault(true);
@@ -264,9 +268,10 @@ void MainWindow::stopProgressAnimation() {
     showProgress();
 }
 
-// QProgressBar animates whenever its range is empty, so a busy bar that is not animating
-// shows as an empty, still bar.
+// QProgressBar animates whenever its range is empty, so a busy bar that is not animating is an
+// empty, still bar; like a stopped spinner, it is not shown.
 void MainWindow::showProgress() {
+    m_spinner->setVisible(!m_busy || m_animating);
     if (!m_busy) {
         m_spinner->setRange(qRound(m_minimum), qRound(m_maximum));
         m_spinner->setValue(qRound(m_value));

@@ -153,20 +153,44 @@ TEST_F(Window, TheEditorSharesTheControllersDocument) {
     EXPECT_EQ(controller().message()->toPlainText(), QStringLiteral("Dear {toName}"));
 }
 
-TEST_F(Window, BoldFromTheToolBarReachesTheMessage) {
+QAction* formattingAction(QWidget* toolBar, const QString& text) {
+    for (QAction* action : toolBar->actions())
+        if (action->text() == text)
+            return action;
+    return nullptr;
+}
+
+QFont::Weight weightAt(QTextDocument* document, int position) {
+    QTextCursor cursor(document);
+    cursor.setPosition(position);
+    return static_cast<QFont::Weight>(cursor.charFormat().fontWeight());
+}
+
+TEST_F(Window, BoldFromTheToolBarReachesTheSelection) {
     auto* editor = child<QTextEdit>("message");
     QTest::keyClicks(editor, QStringLiteral("Hello"));
     editor->selectAll();
-    QAction* bold = nullptr;
-    for (QAction* action : child<QWidget>("formatting")->actions())
-        if (action->text() == QStringLiteral("Bold"))
-            bold = action;
+    QAction* bold = formattingAction(child<QWidget>("formatting"), QStringLiteral("Bold"));
     ASSERT_NE(bold, nullptr);
     bold->trigger();
-    QTextCursor cursor(controller().message());
-    cursor.setPosition(2);
-    EXPECT_EQ(cursor.charFormat().fontWeight(), QFont::Bold);
+    EXPECT_EQ(weightAt(controller().message(), 2), QFont::Bold);
     EXPECT_TRUE(bold->isChecked());
+}
+
+TEST_F(Window, BoldSwitchedOnAndOffWhileTypingFormatsOnlyWhatWasTypedBetween) {
+    auto* editor = child<QTextEdit>("message");
+    QAction* bold = formattingAction(child<QWidget>("formatting"), QStringLiteral("Bold"));
+    ASSERT_NE(bold, nullptr);
+    QTest::keyClicks(editor, QStringLiteral("on "));
+    bold->trigger();
+    QTest::keyClicks(editor, QStringLiteral("Saturday"));
+    bold->trigger();
+    QTest::keyClicks(editor, QStringLiteral(" at"));
+    QTextDocument* message = controller().message();
+    EXPECT_EQ(message->toPlainText(), QStringLiteral("on Saturday at"));
+    EXPECT_EQ(weightAt(message, 2), QFont::Normal);  // "on"
+    EXPECT_EQ(weightAt(message, 11), QFont::Bold);   // the "y" of "Saturday"
+    EXPECT_EQ(weightAt(message, 14), QFont::Normal); // "at"
 }
 
 TEST_F(Window, OnlyTheUsersEditsOfToAndNameDropAGroupSelection) {
