@@ -69,7 +69,7 @@ PeoplePicker::PeoplePicker(AddressBook& addressBook, QWidget* parent)
     splitter->addWidget(createGroupColumn());
     splitter->addWidget(createPersonColumn());
     splitter->addWidget(createAddressColumn());
-    splitter->setSizes({180, 280, 260});
+    splitter->setSizes({170, 290, 260});
     auto* hint = new QLabel(LocalizedStringNS(
         "Choose a group to mail each of its members, or a person to mail one message."));
     hint->setWordWrap(true);
@@ -104,35 +104,44 @@ QWidget* PeoplePicker::createColumn(const char* title, QListWidget* list, QList<
     return column;
 }
 
-QPushButton* PeoplePicker::button(const char* text, const char* objectName,
+QPushButton* PeoplePicker::button(const char* text, const char* toolTip, const char* objectName,
                                   void (PeoplePicker::*action)()) {
     auto* made = new QPushButton(LocalizedStringNS(text));
     made->setObjectName(QLatin1String(objectName));
+    made->setToolTip(LocalizedStringNS(toolTip));
     made->setAutoDefault(false);
+    // A one-sign button ("+", "-") is square rather than as wide as a worded one.
+    if (made->text().size() == 1)
+        made->setFixedWidth(made->sizeHint().height() + 6);
     connect(made, &QPushButton::clicked, this, action);
     return made;
 }
 
 QWidget* PeoplePicker::createGroupColumn() {
-    m_renameGroup = button("Rename...", "renameGroup", &PeoplePicker::renameGroup);
-    m_deleteGroup = button("Delete", "deleteGroup", &PeoplePicker::deleteGroup);
-    return createColumn(
-        "&Group", m_groups,
-        {button("New...", "newGroup", &PeoplePicker::newGroup), m_renameGroup, m_deleteGroup});
+    m_renameGroup =
+        button("Rename...", "Rename the group", "renameGroup", &PeoplePicker::renameGroup);
+    m_deleteGroup = button("−", "Delete the group", "deleteGroup", &PeoplePicker::deleteGroup);
+    return createColumn("&Group", m_groups,
+                        {button("+", "New group", "newGroup", &PeoplePicker::newGroup),
+                         m_deleteGroup, m_renameGroup});
 }
 
 QWidget* PeoplePicker::createPersonColumn() {
-    m_editPerson = button("Edit...", "editPerson", &PeoplePicker::editPerson);
-    m_deletePerson = button("Delete", "deletePerson", &PeoplePicker::deletePersons);
+    m_editPerson = button("Edit...", "Edit the person's names, addresses and groups", "editPerson",
+                          &PeoplePicker::editPerson);
+    m_deletePerson = button("−", "Delete the selected persons from the address book",
+                            "deletePerson", &PeoplePicker::deletePersons);
     m_groupsOfPerson = new QPushButton(LocalizedStringNS("Groups"));
+    m_groupsOfPerson->setToolTip(LocalizedStringNS("Add the selected persons to a group, or "
+                                                   "remove them from the group shown"));
     m_groupsOfPerson->setObjectName(QStringLiteral("membership"));
     m_groupsOfPerson->setAutoDefault(false);
     m_membership = new QMenu(m_groupsOfPerson);
     m_groupsOfPerson->setMenu(m_membership);
     connect(m_membership, &QMenu::aboutToShow, this, &PeoplePicker::fillMembershipMenu);
     return createColumn("&Name", m_persons,
-                        {button("New...", "newPerson", &PeoplePicker::newPerson), m_editPerson,
-                         m_deletePerson, m_groupsOfPerson});
+                        {button("+", "New person", "newPerson", &PeoplePicker::newPerson),
+                         m_deletePerson, m_editPerson, m_groupsOfPerson});
 }
 
 QWidget* PeoplePicker::createAddressColumn() {

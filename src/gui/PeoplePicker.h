@@ -52,7 +52,8 @@ private:
     QWidget* createGroupColumn();
     QWidget* createPersonColumn();
     QWidget* createAddressColumn();
-    QPushButton* button(const char* text, const char* objectName, void (PeoplePicker::*action)());
+    QPushButton* button(const char* text, const char* toolTip, const char* objectName,
+                        void (PeoplePicker::*action)());
 
     void groupsChosen();
     void personsChosen();
