@@ -48,6 +48,10 @@ struct TestSettings {
         settings().setValue(QLatin1String(key), value);
         settings().sync();
     }
+    static void clearSettings() {
+        settings().clear();
+        settings().sync();
+    }
 };
 
 // A controller over a recording view, a fresh SQLite address book and empty settings.
@@ -55,8 +59,7 @@ class ControllerFixture : public ::testing::Test, protected TestSettings {
 protected:
     void SetUp() override {
         ASSERT_TRUE(folder.isValid());
-        settings().clear();
-        settings().sync();
+        clearSettings();
         book = std::make_unique<AddressBook>(folder.filePath(QStringLiteral("book.sqlite")));
         controller = std::make_unique<PelmoController>(view, *book, keyring);
     }

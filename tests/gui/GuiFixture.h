@@ -25,8 +25,7 @@ class GuiFixture : public ::testing::Test, protected TestSettings {
 protected:
     void SetUp() override {
         ASSERT_TRUE(folder.isValid());
-        settings().clear();
-        settings().sync();
+        clearSettings();
         book = std::make_unique<AddressBook>(folder.filePath(QStringLiteral("book.sqlite")));
         window = std::make_unique<MainWindow>(*book, keyring);
         controller().startUp();
