@@ -2,15 +2,22 @@
 BUILD_TEST ?= build/test
 BUILD_FUZZ ?= build/fuzz
 BUILD_BENCH ?= build/bench
+BUILD_RUN ?= build/run
 JOBS ?= 2
 FUZZ_SECONDS ?= 60
 
-.PHONY: all deps test bench fuzz clean
+.PHONY: all deps run test bench fuzz clean
 
 all: test
 
 deps:
 	@bash scripts/install-deps.sh
+
+# Builds Pelmo (debug, no sanitizers) and opens its window.
+run: deps
+	cmake -S . -B $(BUILD_RUN) -G Ninja -DCMAKE_BUILD_TYPE=Debug -DPELMO_BUILD_TESTS=OFF
+	cmake --build $(BUILD_RUN) -j $(JOBS) --target pelmo
+	$(BUILD_RUN)/src/pelmo
 
 # The test build runs under AddressSanitizer and UndefinedBehaviorSanitizer.
 test: deps

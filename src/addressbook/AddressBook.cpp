@@ -1,5 +1,6 @@
 #include "addressbook/AddressBook.h"
 
+#include "addressbook/ImportText.h"
 #include "util/DataFolder.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
@@ -39,6 +40,33 @@ QString personKey(const Person& person) {
 }
 
 constexpr const char* kPersonColumns = "p.id, p.first_name, p.last_name, p.primary_position";
+
+[[noreturn]] void refuse(const char* name, const QString& reason) {
+    throw PelmoException(QString::fromLatin1(name), reason);
+}
+
+// Names end up in mail headers, where a line break would start a header of its own.
+void checkName(const QString& name) {
+    for (const QChar c : name) {
+        if (c.category() == QChar::Other_Control)
+            refuse("BadName", LocalizedString("A name cannot hold a line break or another "
+                                              "control character."));
+    }
+}
+
+void checkPerson(const Person& person) {
+    if (person.firstName.trimmed().isEmpty() && person.lastName.trimmed().isEmpty())
+        refuse("NoPersonName", LocalizedString("A person needs a first or a last name."));
+    checkName(person.firstName);
+    checkName(person.lastName);
+    for (const QString& address : person.emails) {
+        if (!ImportText::isPlausibleAddress(address))
+            refuse("BadAddress", LocalizedString("\"%1\" is not an e-mail address.").arg(address));
+    }
+    if (!person.emails.isEmpty() && (person.primary < 0 || person.primary >= person.emails.size()))
+        refuse("BadPrimaryAddress",
+               LocalizedString("One of the person's addresses must be the primary one."));
+}
 
 } // namespace
 
@@ -173,8 +201,7 @@ std::optional<QList<Person>> AddressBook::members(qint64 groupId) const {
         groupId);
 }
 
-QList<Group> AddressBook::groups() const {
-    QSqlQuery query = prepared(QStringLiteral("SELECT id, name FROM groups ORDER BY folded"));
+QList<Group> AddressBook::loadGroups(QSqlQuery& query) const {
     run(query);
     QList<Group> groups;
     while (query.next())
@@ -182,34 +209,54 @@ QList<Group> AddressBook::groups() const {
     return groups;
 }
 
+QList<Group> AddressBook::groups() const {
+    QSqlQuery query = prepared(QStringLiteral("SELECT id, name FROM groups ORDER BY folded"));
+    return loadGroups(query);
+}
+
 std::optional<Group> AddressBook::group(qint64 id) const {
     QSqlQuery query = prepared(QStringLiteral("SELECT id, name FROM groups WHERE id = ?"));
     query.addBindValue(id);
-    run(query);
-    if (!query.next())
-        return std::nullopt;
-    return Group{query.value(0).toLongLong(), query.value(1).toString()};
+    const QList<Group> found = loadGroups(query);
+    return found.isEmpty() ? std::nullopt : std::optional<Group>(found.constFirst());
 }
 
 std::optional<Group> AddressBook::groupNamed(const QString& name) const {
     QSqlQuery query = prepared(QStringLiteral("SELECT id, name FROM groups WHERE folded = ?"));
     query.addBindValue(name.toCaseFolded());
-    run(query);
-    if (!query.next())
-        return std::nullopt;
-    return Group{query.value(0).toLongLong(), query.value(1).toString()};
+    const QList<Group> found = loadGroups(query);
+    return found.isEmpty() ? std::nullopt : std::optional<Group>(found.constFirst());
 }
 
-ImportSummary AddressBook::add(const QList<ImportedContact>& contacts) {
+QList<Group> AddressBook::groupsOf(qint64 personId) const {
+    QSqlQuery query = prepared(
+        QStringLiteral("SELECT g.id, g.name FROM groups g JOIN group_members m ON m.group_id = "
+                       "g.id WHERE m.person_id = ? ORDER BY g.folded"));
+    query.addBindValue(personId);
+    return loadGroups(query);
+}
+
+void AddressBook::inTransaction(const std::function<void()>& change) {
     QSqlDatabase db = QSqlDatabase::database(connectionName, false);
     if (!db.transaction())
         fail(db.lastError().text());
     try {
+        change();
+        if (!db.commit())
+            fail(db.lastError().text());
+    } catch (...) {
+        db.rollback();
+        throw;
+    }
+}
+
+ImportSummary AddressBook::add(const QList<ImportedContact>& contacts) {
+    ImportSummary summary;
+    inTransaction([&] {
         QHash<QString, qint64> known;
         for (const Person& person : persons())
             known.insert(personKey(person), person.id);
         QSet<QString> groupNames;
-        ImportSummary summary;
         for (const ImportedContact& contact : contacts) {
             const QString key = personKey(contact.person);
             qint64 id = known.value(key, 0);
@@ -222,17 +269,12 @@ ImportSummary AddressBook::add(const QList<ImportedContact>& contacts) {
             }
             for (const QString& name : contact.groups) {
                 groupNames.insert(name.toCaseFolded());
-                addMember(groupId(name), id);
+                insertMember(groupId(name), id);
             }
         }
         summary.groups = static_cast<int>(groupNames.size());
-        if (!db.commit())
-            fail(db.lastError().text());
-        return summary;
-    } catch (...) {
-        db.rollback();
-        throw;
-    }
+    });
+    return summary;
 }
 
 qint64 AddressBook::insertPerson(const Person& person) {
@@ -243,15 +285,19 @@ qint64 AddressBook::insertPerson(const Person& person) {
     insert.addBindValue(person.emails.isEmpty() ? -1 : person.primary);
     run(insert);
     const qint64 id = insert.lastInsertId().toLongLong();
+    insertEmails(id, person.emails);
+    return id;
+}
+
+void AddressBook::insertEmails(qint64 personId, const QStringList& emails) {
     QSqlQuery email = prepared(
         QStringLiteral("INSERT INTO emails (person_id, position, address) VALUES (?, ?, ?)"));
-    for (qsizetype i = 0; i < person.emails.size(); ++i) {
-        email.bindValue(0, id);
+    for (qsizetype i = 0; i < emails.size(); ++i) {
+        email.bindValue(0, personId);
         email.bindValue(1, static_cast<int>(i));
-        email.bindValue(2, person.emails.at(i));
+        email.bindValue(2, emails.at(i));
         run(email);
     }
-    return id;
 }
 
 qint64 AddressBook::groupId(const QString& name) {
@@ -264,12 +310,105 @@ qint64 AddressBook::groupId(const QString& name) {
     return insert.lastInsertId().toLongLong();
 }
 
-void AddressBook::addMember(qint64 group, qint64 person) {
-    QSqlQuery insert = prepared(QStringLiteral(
-        "INSERT OR IGNORE INTO group_members (group_id, person_id, position) VALUES (?, ?, "
-        "(SELECT COALESCE(MAX(position), 0) + 1 FROM group_members WHERE group_id = ?))"));
-    insert.addBindValue(group);
-    insert.addBindValue(person);
-    insert.addBindValue(group);
-    run(insert);
+void AddressBook::insertMember(qint64 group, qint64 person) {
+    execute("INSERT OR IGNORE INTO group_members (group_id, person_id, position) VALUES (?, ?, "
+            "(SELECT COALESCE(MAX(position), 0) + 1 FROM group_members WHERE group_id = ?))",
+            {group, person, group});
+}
+
+void AddressBook::execute(const char* sql, const QVariantList& values) {
+    QSqlQuery query = prepared(QString::fromLatin1(sql));
+    for (const QVariant& value : values)
+        query.addBindValue(value);
+    run(query);
+}
+
+void AddressBook::requirePerson(qint64 personId) const {
+    if (!person(personId))
+        refuse("NoSuchPerson",
+               LocalizedString("The address book has no person numbered %1.").arg(personId));
+}
+
+void AddressBook::requireGroup(qint64 groupId) const {
+    if (!group(groupId))
+        refuse("NoSuchGroup",
+               LocalizedString("The address book has no group numbered %1.").arg(groupId));
+}
+
+QString AddressBook::newGroupName(const QString& name, qint64 renamedGroupId) const {
+    const QString trimmed = name.trimmed();
+    if (trimmed.isEmpty())
+        refuse("NoGroupName", LocalizedString("A group needs a name."));
+    checkName(trimmed);
+    const std::optional<Group> existing = groupNamed(trimmed);
+    if (existing && existing->id != renamedGroupId)
+        refuse("GroupNameTaken",
+               LocalizedString("There is already a group named \"%1\".").arg(existing->name));
+    return trimmed;
+}
+
+qint64 AddressBook::addPerson(const Person& person) {
+    checkPerson(person);
+    qint64 id = 0;
+    inTransaction([&] { id = insertPerson(person); });
+    return id;
+}
+
+void AddressBook::updatePerson(const Person& person) {
+    checkPerson(person);
+    inTransaction([&] {
+        requirePerson(person.id);
+        execute("UPDATE persons SET first_name = ?, last_name = ?, primary_position = ? "
+                "WHERE id = ?",
+                {person.firstName, person.lastName, person.emails.isEmpty() ? -1 : person.primary,
+                 person.id});
+        execute("DELETE FROM emails WHERE person_id = ?", {person.id});
+        insertEmails(person.id, person.emails);
+    });
+}
+
+void AddressBook::removePerson(qint64 personId) {
+    inTransaction([&] {
+        requirePerson(personId);
+        execute("DELETE FROM persons WHERE id = ?", {personId});
+    });
+}
+
+qint64 AddressBook::addGroup(const QString& name) {
+    qint64 id = 0;
+    inTransaction([&] { id = groupId(newGroupName(name, 0)); });
+    return id;
+}
+
+void AddressBook::renameGroup(qint64 groupId, const QString& name) {
+    inTransaction([&] {
+        requireGroup(groupId);
+        const QString newName = newGroupName(name, groupId);
+        execute("UPDATE groups SET name = ?, folded = ? WHERE id = ?",
+                {newName, newName.toCaseFolded(), groupId});
+    });
+}
+
+void AddressBook::removeGroup(qint64 groupId) {
+    inTransaction([&] {
+        requireGroup(groupId);
+        execute("DELETE FROM groups WHERE id = ?", {groupId});
+    });
+}
+
+void AddressBook::addMember(qint64 groupId, qint64 personId) {
+    inTransaction([&] {
+        requireGroup(groupId);
+        requirePerson(personId);
+        insertMember(groupId, personId);
+    });
+}
+
+void AddressBook::removeMember(qint64 groupId, qint64 personId) {
+    inTransaction([&] {
+        requireGroup(groupId);
+        requirePerson(personId);
+        execute("DELETE FROM group_members WHERE group_id = ? AND person_id = ?",
+                {groupId, personId});
+    });
 }

@@ -8,6 +8,7 @@
 #include <QString>
 #include <QVariant>
 
+#include <functional>
 #include <optional>
 
 class QSqlQuery;
@@ -59,6 +60,34 @@ public:
      */
     ImportSummary add(const QList<ImportedContact>& contacts);
 
+    // Editing, one change at a time. Each change runs in a transaction of its own: it is kept
+    // whole or not at all. A change the book refuses throws PelmoException named NoSuchPerson,
+    // NoSuchGroup, NoPersonName, BadName, BadAddress, BadPrimaryAddress, NoGroupName or
+    // GroupNameTaken, with a reason for the user; a database failure throws
+    // AddressBookUnavailable as elsewhere.
+
+    /**
+     * Adds person (its id is ignored) and answers the new id. It needs a first or a last name,
+     * names without control characters, plausible addresses and, when it has addresses, a
+     * primary one among them.
+     */
+    qint64 addPerson(const Person& person);
+    /** Replaces the names and addresses of the person person.id, under the rules of addPerson. */
+    void updatePerson(const Person& person);
+    /** Removes the person, from every group too. */
+    void removePerson(qint64 personId);
+    /** Adds an empty group and answers its id; the name is trimmed and must be new. */
+    qint64 addGroup(const QString& name);
+    void renameGroup(qint64 groupId, const QString& name);
+    /** Removes the group; its members stay in the book. */
+    void removeGroup(qint64 groupId);
+    /** The person joins the end of the group; a member already there keeps its place. */
+    void addMember(qint64 groupId, qint64 personId);
+    /** The person leaves the group; nothing happens when it was no member. */
+    void removeMember(qint64 groupId, qint64 personId);
+    /** The groups the person belongs to, by name. */
+    QList<Group> groupsOf(qint64 personId) const;
+
 private:
     void open();
     void createTables();
@@ -67,8 +96,17 @@ private:
     QList<Person> loadPersons(const QString& personsSql, const QString& emailsSql,
                               const QVariant& bound = {}) const;
     qint64 insertPerson(const Person& person);
+    void insertEmails(qint64 personId, const QStringList& emails);
     qint64 groupId(const QString& name);
-    void addMember(qint64 group, qint64 person);
+    void insertMember(qint64 group, qint64 person);
+    /** Runs change in a transaction, rolled back when change throws. */
+    void inTransaction(const std::function<void()>& change);
+    /** Runs sql with values bound in order. */
+    void execute(const char* sql, const QVariantList& values);
+    QList<Group> loadGroups(QSqlQuery& query) const;
+    void requirePerson(qint64 personId) const;
+    void requireGroup(qint64 groupId) const;
+    QString newGroupName(const QString& name, qint64 renamedGroupId) const;
     [[noreturn]] void fail(const QString& detail) const;
 
     QString filePath;

@@ -7,23 +7,19 @@
 PasswordStore::PasswordStore(QString serviceName, int timeout)
     : service(std::move(serviceName)), timeoutMs(timeout) {}
 
-QString PasswordStore::readPassword(const QString& key) {
-    if (keyringAbsent)
-        return {};
+int PasswordStore::runJob(QKeychain::Job* job,
+                          const std::function<void(QKeychain::Job&)>& onFinished) {
     // The job deletes itself once finished, also when that happens after the time-out; the
     // connection dies with the loop, so a late answer touches nothing here.
-    auto* job = new QKeychain::ReadPasswordJob(service);
     job->setAutoDelete(true);
-    job->setKey(key);
     QEventLoop loop;
     bool finished = false;
     QKeychain::Error error = QKeychain::OtherError;
-    QString password;
     QObject::connect(job, &QKeychain::Job::finished, &loop, [&] {
         finished = true;
         error = job->error();
-        if (error == QKeychain::NoError)
-            password = job->textData();
+        if (onFinished)
+            onFinished(*job);
         loop.quit();
     });
     QTimer::singleShot(timeoutMs, &loop, &QEventLoop::quit);
@@ -32,7 +28,39 @@ QString PasswordStore::readPassword(const QString& key) {
     if (!finished || (error != QKeychain::NoError && error != QKeychain::EntryNotFound)) {
         // No keyring, no backend or access refused: the settings key serves from now on.
         keyringAbsent = true;
-        return {};
+        return QKeychain::OtherError;
     }
+    return error;
+}
+
+QString PasswordStore::readPassword(const QString& key) {
+    if (keyringAbsent)
+        return {};
+    auto* job = new QKeychain::ReadPasswordJob(service);
+    job->setKey(key);
+    QString password;
+    runJob(job, [&password](QKeychain::Job& finished) {
+        if (finished.error() == QKeychain::NoError)
+            password = static_cast<QKeychain::ReadPasswordJob&>(finished).textData();
+    });
     return password;
+}
+
+bool PasswordStore::writePassword(const QString& key, const QString& password) {
+    if (keyringAbsent)
+        return false;
+    auto* job = new QKeychain::WritePasswordJob(service);
+    job->setKey(key);
+    job->setTextData(password);
+    return runJob(job) == QKeychain::NoError;
+}
+
+bool PasswordStore::deletePassword(const QString& key) {
+    if (keyringAbsent)
+        return false;
+    auto* job = new QKeychain::DeletePasswordJob(service);
+    job->setKey(key);
+    const int error = runJob(job);
+    // A missing entry is as good as a deleted one.
+    return error == QKeychain::NoError || error == QKeychain::EntryNotFound;
 }

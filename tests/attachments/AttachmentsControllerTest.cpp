@@ -1,8 +1,8 @@
 #include "attachments/AttachmentsController.h"
 
+#include "DesktopStandIn.h"
 #include "RowName.h"
 
-#include <QDesktopServices>
 #include <QDir>
 #include <QFile>
 #include <QMimeData>
@@ -214,23 +214,9 @@ TEST_F(Attachments, DeleteWithNoSelectionEmptiesTheList) {
     EXPECT_EQ(changes, 1);
 }
 
-// Stands in for the desktop: QDesktopServices hands file URLs to it instead.
-class Desktop : public QObject {
-    Q_OBJECT
-
-public:
-    Desktop() { QDesktopServices::setUrlHandler(QStringLiteral("file"), this, "open"); }
-    ~Desktop() override { QDesktopServices::unsetUrlHandler(QStringLiteral("file")); }
-
-    QList<QUrl> opened;
-
-public Q_SLOTS:
-    void open(const QUrl& url) { opened += url; }
-};
-
 TEST_F(Attachments, OpenHandsTheFileToTheDesktop) {
     fill({"/home/ada/a.pdf", "/home/ada/b c.pdf"});
-    Desktop desktop;
+    DesktopStandIn desktop;
     EXPECT_TRUE(controller.openAttachment(1));
     EXPECT_EQ(desktop.opened,
               QList<QUrl>{QUrl::fromLocalFile(QStringLiteral("/home/ada/b c.pdf"))});
@@ -238,12 +224,10 @@ TEST_F(Attachments, OpenHandsTheFileToTheDesktop) {
 
 TEST_F(Attachments, OpenWithoutARowIsIgnored) {
     fill({"/home/ada/a.pdf"});
-    Desktop desktop;
+    DesktopStandIn desktop;
     EXPECT_FALSE(controller.openAttachment(-1));
     EXPECT_FALSE(controller.openAttachment(1));
     EXPECT_TRUE(desktop.opened.isEmpty());
 }
 
 } // namespace
-
-#include "AttachmentsControllerTest.moc"

@@ -1,0 +1,329 @@
+#include "gui/MainWindow.h"
+
+#include "attachments/AttachmentsController.h"
+#include "controller/PelmoController.h"
+#include "gui/AlertBox.h"
+#include "gui/AttachmentsWindow.h"
+#include "gui/FormattingToolBar.h"
+#include "gui/PeoplePicker.h"
+#include "gui/PreferencesDialog.h"
+#include "gui/RecipientsWindow.h"
+#include "util/LocalizedStrings.h"
+
+#include <QAction>
+#include <QApplication>
+#include <QFormLayout>
+#include <QHBoxLayout>
+#include <QKeySequence>
+#include <QLabel>
+#include <QLineEdit>
+#include <QMenuBar>
+#include <QProgressBar>
+#include <QPushButton>
+#include <QShortcut>
+#include <QStyle>
+#include <QTextEdit>
+#include <QToolBar>
+#include <QVBoxLayout>
+
+namespace {
+
+QLineEdit* lineEdit(const char* objectName, const char* placeholder) {
+    auto* edit = new QLineEdit;
+    edit->setObjectName(QLatin1String(objectName));
+    edit->setPlaceholderText(LocalizedStringNS(placeholder));
+    edit->setClearButtonEnabled(true);
+    return edit;
+}
+
+// A themed icon where the desktop has one, else the style's stand-in.
+QIcon icon(const char* themeName, QStyle::StandardPixmap fallback) {
+    return QIcon::fromTheme(QLatin1String(themeName), qApp->style()->standardIcon(fallback));
+}
+
+} // namespace
+
+MainWindow::MainWindow(AddressBook& addressBook, PasswordStore& passwords, QWidget* parent)
+    : QMainWindow(parent), m_passwords(passwords),
+      m_controller(std::make_unique<PelmoController>(*this, addressBook, passwords)) {
+    setWindowTitle(LocalizedStringNS("Pelmo"));
+    auto* central = new QWidget;
+    auto* layout = new QVBoxLayout(central);
+    layout->addWidget(createFields());
+    layout->addWidget(createEditor(), 1);
+    layout->addWidget(createSendRow());
+    setCentralWidget(central);
+
+    m_recipients = new RecipientsWindow(*m_controller, this);
+    m_picker = new PeoplePicker(addressBook, this);
+    // The window shows the controller's own list, which every message carries as it stands.
+    m_attachmentsWindow = new AttachmentsWindow(m_controller->getAttachments(), this);
+    createActions();
+    connectPicker();
+    showProgress();
+    resize(860, 640);
+}
+
+AttachmentsController& MainWindow::attachments() const {
+    return m_controller->getAttachments();
+}
+
+MainWindow::~MainWindow() {
+    // The editor and the tables show what the controller holds, and the controller (a member)
+    // goes first: the widgets that show it go before.
+    delete m_attachmentsWindow;
+    delete m_recipients;
+    delete centralWidget();
+}
+
+QWidget* MainWindow::createFields() {
+    m_to = lineEdit("to", "someone@example.org");
+    m_name = lineEdit("name", "First Last");
+    m_subject = lineEdit("subject", "What the message is about");
+    m_webPageOrFile = lineEdit("webPageOrFile", "https://... (a page to mail with every copy)");
+    reportEdits(m_to, PelmoView::Field::To);
+    reportEdits(m_name, PelmoView::Field::Name);
+    reportEdits(m_subject, PelmoView::Field::Subject);
+
+    auto* fields = new QWidget;
+    auto* form = new QFormLayout(fields);
+    form->setContentsMargins(0, 0, 0, 0);
+    form->setFieldGrowthPolicy(QFormLayout::AllNonFixedFieldsGrow);
+    form->addRow(LocalizedStringNS("Recipient Address:"), m_to);
+    form->addRow(LocalizedStringNS("Recipients Name:"), m_name);
+    form->addRow(LocalizedStringNS("Subject:"), m_subject);
+    form->addRow(LocalizedStringNS("Web Page:"), m_webPageOrFile);
+    return fields;
+}
+
+void MainWindow::reportEdits(QLineEdit* edit, PelmoView::Field field) {
+    connect(edit, &QLineEdit::textEdited, m_controller.get(),
+            [this, field] { m_controller->textDidChange(field); });
+}
+
+QWidget* MainWindow::createEditor() {
+    m_message = new QTextEdit;
+    m_message->setObjectName(QStringLiteral("message"));
+    m_message->setDocument(m_controller->message());
+    m_message->setAcceptRichText(true);
+    m_message->setPlaceholderText(
+        LocalizedStringNS("Write the message here. {toName}, {to}, {fromName}, {from} and "
+                          "{subject} become each copy's own values."));
+
+    auto* editor = new QWidget;
+    auto* layout = new QVBoxLayout(editor);
+    layout->setContentsMargins(0, 0, 0, 0);
+    layout->setSpacing(2);
+    layout->addWidget(new FormattingToolBar(m_message));
+    layout->addWidget(m_message, 1);
+    return editor;
+}
+
+QWidget* MainWindow::createSendRow() {
+    m_status = new QLabel;
+    m_status->setObjectName(QStringLiteral("status"));
+    m_status->setTextInteractionFlags(Qt::TextSelectableByMouse);
+    // A long status line is cut at the window's edge rather than widening the window.
+    m_status->setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Preferred);
+    m_spinner = new QProgressBar;
+    m_spinner->setObjectName(QStringLiteral("spinner"));
+    m_spinner->setTextVisible(false);
+    m_spinner->setFixedWidth(160);
+    // Hidden while idle, without the status line and the button moving when it shows.
+    QSizePolicy keepPlace = m_spinner->sizePolicy();
+    keepPlace.setRetainSizeWhenHidden(true);
+    m_spinner->setSizePolicy(keepPlace);
+    m_sendButton = new QPushButton(LocalizedStringNS("Send"));
+    m_sendButton->setObjectName(QStringLiteral("sendButton"));
+    m_sendButton->setDefault(true);
+    m_sendButton->setMinimumWidth(96);
+    m_sendButton->setToolTip(LocalizedStringNS("Send the message (Ctrl+Return)"));
+    connect(m_sendButton, &QPushButton::clicked, m_controller.get(), &PelmoController::send);
+    auto* shortcut = new QShortcut(QKeySequence(Qt::CTRL | Qt::Key_Return), this);
+    connect(shortcut, &QShortcut::activated, m_sendButton, &QPushButton::click);
+
+    auto* row = new QWidget;
+    auto* layout = new QHBoxLayout(row);
+    layout->setContentsMargins(0, 0, 0, 0);
+    layout->addWidget(m_status, 1);
+    layout->addWidget(m_spinner);
+    layout->addWidget(m_sendButton);
+    return row;
+}
+
+void MainWindow::createActions() {
+    auto* preferences = new QAction(icon("preferences-system", QStyle::SP_FileDialogDetailedView),
+                                    LocalizedStringNS("Preferences"), this);
+    preferences->setObjectName(QStringLiteral("preferencesAction"));
+    preferences->setShortcut(QKeySequence::Preferences);
+    connect(preferences, &QAction::triggered, this, &MainWindow::showPreferences);
+    auto* addresses = new QAction(icon("x-office-address-book", QStyle::SP_DirHomeIcon),
+                                  LocalizedStringNS("Addresses"), this);
+    addresses->setObjectName(QStringLiteral("addressesAction"));
+    connect(addresses, &QAction::triggered, this, &MainWindow::showPeoplePicker);
+    auto* console = new QAction(icon("utilities-log-viewer", QStyle::SP_FileDialogContentsView),
+                                LocalizedStringNS("Console"), this);
+    console->setObjectName(QStringLiteral("consoleAction"));
+    console->setToolTip(LocalizedStringNS("Show the activity log"));
+    connect(console, &QAction::triggered, m_controller.get(), &PelmoController::openConsole);
+    auto* attachments = new QAction(icon("mail-attachment", QStyle::SP_FileIcon),
+                                    LocalizedStringNS("Attachments"), this);
+    attachments->setObjectName(QStringLiteral("attachmentsAction"));
+    connect(attachments, &QAction::triggered, this, &MainWindow::showAttachments);
+    auto* recipients = new QAction(LocalizedStringNS("Sent Recipients"), this);
+    connect(recipients, &QAction::triggered, this, &MainWindow::showRecipientsWindow);
+    auto* quit = new QAction(LocalizedStringNS("Quit"), this);
+    quit->setShortcut(QKeySequence::Quit);
+    connect(quit, &QAction::triggered, qApp, &QApplication::quit);
+
+    auto* tools = addToolBar(LocalizedStringNS("Tools"));
+    tools->setObjectName(QStringLiteral("tools"));
+    tools->setMovable(false);
+    tools->setToolButtonStyle(Qt::ToolButtonTextBesideIcon);
+    tools->addActions({preferences, addresses, attachments, console});
+
+    QMenu* file = menuBar()->addMenu(LocalizedStringNS("&File"));
+    file->addAction(preferences);
+    file->addSeparator();
+    file->addAction(quit);
+    QMenu* window = menuBar()->addMenu(LocalizedStringNS("&Window"));
+    window->addActions({addresses, attachments, recipients, console});
+}
+
+void MainWindow::connectPicker() {
+    PelmoController* controller = m_controller.get();
+    connect(m_picker, &PeoplePicker::groupSelectionChanged, controller,
+            &PelmoController::abGroupSelected);
+    for (auto signal : {&PeoplePicker::nameSelectionChanged, &PeoplePicker::valueSelectionChanged,
+                        &PeoplePicker::displayedPropertyChanged})
+        connect(m_picker, signal, controller, &PelmoController::abRecordSelected);
+}
+
+QString MainWindow::subject() const {
+    return m_subject->text();
+}
+
+void MainWindow::setSubject(const QString& text) {
+    m_subject->setText(text);
+}
+
+QString MainWindow::to() const {
+    return m_to->text();
+}
+
+void MainWindow::setTo(const QString& text) {
+    m_to->setText(text);
+}
+
+QString MainWindow::name() const {
+    return m_name->text();
+}
+
+void MainWindow::setName(const QString& text) {
+    m_name->setText(text);
+}
+
+QString MainWindow::webPageOrFile() const {
+    return m_webPageOrFile->text();
+}
+
+void MainWindow::setWebPageOrFile(const QString& text) {
+    m_webPageOrFile->setText(text);
+}
+
+void MainWindow::setStatus(const QString& text) {
+    m_status->setText(text);
+    m_status->setToolTip(text);
+}
+
+void MainWindow::setProgressCounting(double minimum, double maximum, double value) {
+    m_busy = false;
+    m_minimum = minimum;
+    m_maximum = maximum;
+    m_value = value;
+    showProgress();
+}
+
+void MainWindow::setProgressBusy() {
+    m_busy = true;
+    showProgress();
+}
+
+void MainWindow::setProgressValue(double value) {
+    m_value = value;
+    showProgress();
+}
+
+double MainWindow::progressMaximum() const {
+    return m_maximum;
+}
+
+void MainWindow::startProgressAnimation() {
+    m_animating = true;
+    showProgress();
+}
+
+void MainWindow::stopProgressAnimation() {
+    m_animating = false;
+    showProgress();
+}
+
+// QProgressBar animates whenever its range is empty, so a busy bar that is not animating is an
+// empty, still bar; like a stopped spinner, it is not shown.
+void MainWindow::showProgress() {
+    m_spinner->setVisible(!m_busy || m_animating);
+    if (!m_busy) {
+        m_spinner->setRange(qRound(m_minimum), qRound(m_maximum));
+        m_spinner->setValue(qRound(m_value));
+    } else if (m_animating) {
+        m_spinner->setRange(0, 0);
+    } else {
+        m_spinner->setRange(0, 1);
+        m_spinner->setValue(0);
+    }
+}
+
+QString MainWindow::sendButtonTitle() const {
+    return m_sendButton->text();
+}
+
+void MainWindow::setSendButtonTitle(const QString& title) {
+    m_sendButton->setText(title);
+}
+
+void MainWindow::showRecipientsWindow() {
+    m_recipients->show();
+    m_recipients->raise();
+    m_recipients->activateWindow();
+}
+
+void MainWindow::reloadRecipients() {
+    m_recipients->reload();
+}
+
+void MainWindow::alert(const QString& title, const QString& informativeText) {
+    openAlert(this, title, informativeText);
+}
+
+void MainWindow::beep() {
+    QApplication::beep();
+}
+
+void MainWindow::showPeoplePicker() {
+    m_picker->show();
+    m_picker->raise();
+    m_picker->activateWindow();
+}
+
+void MainWindow::showAttachments() {
+    m_attachmentsWindow->show();
+    m_attachmentsWindow->raise();
+    m_attachmentsWindow->activateWindow();
+}
+
+void MainWindow::showPreferences() {
+    if (!m_preferences)
+        m_preferences = new PreferencesDialog(m_passwords, this);
+    m_preferences->load();
+    m_preferences->open();
+}

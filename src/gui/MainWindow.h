@@ -1,0 +1,109 @@
+#pragma once
+
+#include "controller/PelmoView.h"
+
+#include <QMainWindow>
+
+#include <memory>
+
+class AddressBook;
+class AttachmentsController;
+class AttachmentsWindow;
+class PasswordStore;
+class PelmoController;
+class PeoplePicker;
+class PreferencesDialog;
+class QLabel;
+class QLineEdit;
+class QProgressBar;
+class QPushButton;
+class QTextEdit;
+class RecipientsWindow;
+
+/**
+ * Pelmo's window: the message editor with its formatting tool bar, the Subject, recipient and
+ * web page fields, the Send/Stop button, the progress bar and the status line, and the buttons
+ * that open the preferences, the people picker, the attachments and the activity log.
+ *
+ * The window owns its controller and drives it only by forwarding: each button calls the
+ * controller's action, each user edit of a field is reported with textDidChange, and the
+ * controller shows its progress through the PelmoView calls. The editor shares the
+ * controller's message document. The window owns the attachments list and hands each change
+ * of it to the controller. The people picker, the sent-recipients window, the attachments
+ * window and the preferences dialog are separate windows owned by this one. The address book
+ * and the password store are not owned and must outlive the window.
+ */
+class MainWindow : public QMainWindow, public PelmoView {
+    Q_OBJECT
+
+public:
+    MainWindow(AddressBook& addressBook, PasswordStore& passwords, QWidget* parent = nullptr);
+    ~MainWindow() override;
+
+    PelmoController& controller() const { return *m_controller; }
+    PeoplePicker& peoplePicker() const { return *m_picker; }
+    RecipientsWindow& recipientsWindow() const { return *m_recipients; }
+    AttachmentsController& attachments() const;
+    AttachmentsWindow& attachmentsWindow() const { return *m_attachmentsWindow; }
+
+    QString subject() const override;
+    void setSubject(const QString& text) override;
+    QString to() const override;
+    void setTo(const QString& text) override;
+    QString name() const override;
+    void setName(const QString& text) override;
+    QString webPageOrFile() const override;
+    void setWebPageOrFile(const QString& text) override;
+    void setStatus(const QString& text) override;
+    void setProgressCounting(double minimum, double maximum, double value) override;
+    void setProgressBusy() override;
+    void setProgressValue(double value) override;
+    double progressMaximum() const override;
+    void startProgressAnimation() override;
+    void stopProgressAnimation() override;
+    QString sendButtonTitle() const override;
+    void setSendButtonTitle(const QString& title) override;
+    void showRecipientsWindow() override;
+    void reloadRecipients() override;
+    /** A window-modal message box on this window; the call returns at once. */
+    void alert(const QString& title, const QString& informativeText) override;
+    void beep() override;
+
+    /** Brings the people picker to the front. */
+    void showPeoplePicker();
+    /** Brings the attachments window to the front. */
+    void showAttachments();
+    /** Opens the preferences as a window-modal dialog. */
+    void showPreferences();
+
+private:
+    QWidget* createFields();
+    QWidget* createEditor();
+    QWidget* createSendRow();
+    void createActions();
+    void connectPicker();
+    /** Reports the user's edits of field, never the text the controller puts there. */
+    void reportEdits(QLineEdit* edit, PelmoView::Field field);
+    void showProgress();
+
+    PasswordStore& m_passwords;
+    std::unique_ptr<PelmoController> m_controller;
+    QLineEdit* m_subject = nullptr;
+    QLineEdit* m_to = nullptr;
+    QLineEdit* m_name = nullptr;
+    QLineEdit* m_webPageOrFile = nullptr;
+    QTextEdit* m_message = nullptr;
+    QPushButton* m_sendButton = nullptr;
+    QProgressBar* m_spinner = nullptr;
+    QLabel* m_status = nullptr;
+    PeoplePicker* m_picker = nullptr;
+    RecipientsWindow* m_recipients = nullptr;
+    PreferencesDialog* m_preferences = nullptr;
+    AttachmentsWindow* m_attachmentsWindow = nullptr;
+    /** The progress indicator's state: a counting bar, or a busy one that may be animated. */
+    bool m_busy = true;
+    bool m_animating = false;
+    double m_minimum = 0;
+    double m_maximum = 0;
+    double m_value = 0;
+};

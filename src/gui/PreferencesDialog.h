@@ -1,0 +1,57 @@
+#pragma once
+
+#include <QDialog>
+#include <QSettings>
+
+class PasswordStore;
+class QCheckBox;
+class QComboBox;
+class QFormLayout;
+class QGroupBox;
+class QLabel;
+class QLineEdit;
+class QSpinBox;
+
+/**
+ * The preferences: sender, default recipient, outgoing server with its login, message format
+ * and what to do when a mailing completes, each kept under its settings key. The password goes
+ * to the system keyring when one answers, else to the settings key "loginPassword"; the dialog
+ * says which. Values are stored as typed: the controller checks them when it mails.
+ *
+ * Owned by its parent (the main window); the password store is not owned.
+ */
+class PreferencesDialog : public QDialog {
+    Q_OBJECT
+
+public:
+    PreferencesDialog(PasswordStore& passwords, QWidget* parent);
+
+    /** Shows the settings as they are now stored. */
+    void load();
+    /** Stores every value shown; the password only when it was changed. */
+    void save();
+    void accept() override;
+
+private:
+    QGroupBox* createSender();
+    QGroupBox* createRecipient();
+    QGroupBox* createServer();
+    QGroupBox* createMessage();
+    QGroupBox* createCompletion();
+    QLineEdit* addText(QFormLayout* form, const char* label, const char* key);
+    QComboBox* addChoice(QFormLayout* form, const char* label, const char* key,
+                         const QList<const char*>& items);
+    void loadPassword();
+    void savePassword();
+    void tellWherePasswordIs(bool stored, bool inKeyring);
+
+    PasswordStore& m_passwords;
+    QSettings m_settings;
+    QList<QLineEdit*> m_texts;
+    QList<QComboBox*> m_choices;
+    QSpinBox* m_port = nullptr;
+    QCheckBox* m_useSSL = nullptr;
+    QLineEdit* m_password = nullptr;
+    QLabel* m_passwordNote = nullptr;
+    QString m_loadedPassword;
+};
