@@ -1,5 +1,6 @@
 #include "GuiFixture.h"
 #include "controller/ScriptedSession.h"
+#include "e2e/E2eSupport.h"
 #include "gui/RecipientsModel.h"
 #include "gui/RecipientsWindow.h"
 
@@ -80,6 +81,24 @@ TEST_F(WindowRun, SendMailsTheTypedRecipientAndFillsTheTable) {
         child<QLabel>("status")->text().startsWith(QStringLiteral("[Mailing completed at ")));
     EXPECT_EQ(calls.filter(QStringLiteral("message to")),
               QStringList{QStringLiteral("message to ann@example.org")});
+}
+
+TEST_F(WindowRun, SendThroughARealServerFillsTheTable) {
+    ServerProcess server(QStringLiteral(PELMO_TEST_DIR "/smtp/smtp_server.py"), {});
+    ASSERT_NE(server.port(), 0);
+    controller().setSessionFactory({}); // the real SMTP client
+    set("serverAddress", QStringLiteral("127.0.0.1"));
+    set("serverPort", server.port());
+    QTest::keyClicks(child<QLineEdit>("to"), QStringLiteral("ann@example.org"));
+    QTest::keyClicks(child<QLineEdit>("name"), QStringLiteral("Ann"));
+    pressSendAndWait();
+    EXPECT_EQ(table(), QStringList{QStringLiteral("1 ann@example.org")});
+    const QList<QByteArray> records = server.records();
+    ASSERT_EQ(records.size(), 1);
+    const ReceivedMessage message = parseMessage(messageOf(records[0]));
+    EXPECT_EQ(message.to, QStringLiteral("Ann <ann@example.org>"));
+    ASSERT_EQ(message.parts.size(), 1);
+    EXPECT_EQ(message.parts[0].content, QByteArray("Hello Ann"));
 }
 
 TEST_F(WindowRun, AGroupCountsOnTheBarAndStopLetsTheCurrentCopyFinish) {
