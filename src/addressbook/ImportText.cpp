@@ -2,6 +2,7 @@
 
 #include "addressbook/ImportError.h"
 #include "util/LocalizedStrings.h"
+#include "util/TextUtilities.h"
 
 #include <QStringDecoder>
 
@@ -14,9 +15,8 @@ std::optional<QString> ImportText::decode(const QByteArray& bytes, const QString
 
 QString ImportText::decodeUnlabelled(const QByteArray& bytes) {
     const QByteArray body = withoutBom(bytes);
-    QStringDecoder utf8(QStringDecoder::Utf8);
-    const QString text = utf8.decode(body);
-    if (!utf8.hasError())
+    const QString text = DecodeUtf8Strictly(body);
+    if (!text.isNull())
         return text;
     return decode(body, QStringLiteral("windows-1252")).value_or(QString::fromLatin1(body));
 }

@@ -10,7 +10,6 @@
 
 #include <QCoreApplication>
 #include <QDateTime>
-#include <QStringDecoder>
 
 namespace {
 
@@ -31,20 +30,11 @@ QString now() {
     return DateDescription(QDateTime::currentDateTime());
 }
 
-// The reply as text, or a null string when it is not valid UTF-8.
-QString decodeStrictly(const QByteArray& bytes) {
-    QStringDecoder decoder(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless);
-    const QString text = decoder.decode(bytes);
-    return decoder.hasError() ? QString() : text;
-}
-
 } // namespace
 
 SMTP::SMTP(PelmoController& controller) : QObject(&controller), m_controller(controller) {}
 
-SMTP::~SMTP() {
-    delete m_message;
-}
+SMTP::~SMTP() = default;
 
 void SMTP::enter(State state) {
     m_state = state;
@@ -91,8 +81,7 @@ void SMTP::start() {
 }
 
 void SMTP::buildMessage() {
-    delete m_message;
-    m_message = new MessageAssembly;
+    m_message = std::make_unique<MessageAssembly>();
     if (!m_controller.getPeople())
         m_controller.view().startProgressAnimation();
     m_message->setSubject(m_controller.getSubject());
@@ -151,8 +140,7 @@ void SMTP::openSession() {
     connect(session, &SmtpSession::connectionTerminated, this, &SMTP::connectionTerminated);
     session->setMessage(m_message->toBytes(), m_message->envelopeSender(),
                         m_message->envelopeRecipients());
-    delete m_message;
-    m_message = nullptr;
+    m_message.reset();
     m_controller.statusMsg(
         LocalizedFormat("Connecting to the %@ server.", {m_controller.getServer()}));
     enter(State::Connecting);
@@ -231,7 +219,7 @@ void SMTP::messageSent() {
 void SMTP::messageNotSent() {
     m_controller.view().beep();
     m_succeeded = false;
-    const QString reply = decodeStrictly(m_session->lastResponse());
+    const QString reply = DecodeUtf8Strictly(m_session->lastResponse());
     if (!reply.isEmpty())
         m_controller.statusMsg(QStringLiteral("Message not sent: %1").arg(reply.trimmed()));
     else

@@ -3,6 +3,8 @@
 #include <QObject>
 #include <QPointer>
 
+#include <memory>
+
 class MessageAssembly;
 class PelmoController;
 class PelmoException;
@@ -80,7 +82,7 @@ private:
     void trap(const PelmoException& failure);
 
     PelmoController& m_controller;
-    MessageAssembly* m_message = nullptr;
+    std::unique_ptr<MessageAssembly> m_message;
     QPointer<SmtpSession> m_session;
     State m_state = State::Created;
     bool m_succeeded = false;

@@ -1,5 +1,7 @@
 #include "util/TextUtilities.h"
 
+#include <QStringDecoder>
+
 #include "text/CString256.h"
 
 #include <QDateTime>
@@ -178,4 +180,10 @@ QString MimeTypeForPath(const QString& path) {
         return {};
     const QList<QMimeType> types = QMimeDatabase().mimeTypesForFileName(fileName);
     return types.isEmpty() ? QString() : types.first().name();
+}
+
+QString DecodeUtf8Strictly(const QByteArray& bytes) {
+    QStringDecoder decoder(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless);
+    const QString text = decoder.decode(bytes);
+    return decoder.hasError() ? QString() : text;
 }

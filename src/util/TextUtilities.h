@@ -57,6 +57,10 @@ void ElapsedTimeMessage(uint32_t seconds, CString256& text);
  */
 QString MimeTypeForPath(const QString& path);
 
+/** bytes as UTF-8 text, or a null string when they are not valid UTF-8 (a cut sequence included).
+ */
+QString DecodeUtf8Strictly(const QByteArray& bytes);
+
 /** A date in the program's one textual form, local time: "2024-05-01 14:03:22 +0200". */
 QString DateDescription(const QDateTime& date);
 

@@ -1,11 +1,12 @@
 #include "relink/browser/FrontBrowser.h"
 
+#include "util/TextUtilities.h"
+
 #include <QEventLoop>
 #include <QNetworkAccessManager>
 #include <QNetworkReply>
 #include <QNetworkRequest>
 #include <QRegularExpression>
-#include <QStringDecoder>
 #include <QUrl>
 
 #include <iconv.h>
@@ -31,12 +32,6 @@ QString convert(const QByteArray& bytes, const QByteArray& charset) {
     return QString::fromUtf8(out);
 }
 
-QString strictUtf8(const QByteArray& bytes) {
-    QStringDecoder decoder(QStringDecoder::Utf8, QStringDecoder::Flag::Stateless);
-    const QString text = decoder.decode(bytes);
-    return decoder.hasError() ? QString() : text;
-}
-
 // The charset named by the Content-Type header, else by the page's own meta element.
 QByteArray declaredCharset(const QNetworkReply& reply, const QByteArray& bytes) {
     static const QRegularExpression charset(
@@ -50,7 +45,7 @@ QByteArray declaredCharset(const QNetworkReply& reply, const QByteArray& bytes) 
 }
 
 QString decodePage(const QNetworkReply& reply, const QByteArray& bytes) {
-    QString text = strictUtf8(bytes);
+    QString text = DecodeUtf8Strictly(bytes);
     if (text.isNull()) {
         const QByteArray declared = declaredCharset(reply, bytes);
         if (!declared.isEmpty())
