@@ -9,15 +9,13 @@
 
 namespace {
 
-// Python's http.server on 127.0.0.1 over a folder of pages; it stops with the test.
+// A folder of pages served on 127.0.0.1 (page_server.py); it stops with the test, or by itself.
 class PageServer {
 public:
     explicit PageServer(const QString& root) {
-        server.setProgram(QStringLiteral("python3"));
-        server.setArguments({QStringLiteral("-u"), QStringLiteral("-m"),
-                             QStringLiteral("http.server"), QStringLiteral("0"),
-                             QStringLiteral("--bind"), QStringLiteral("127.0.0.1"),
-                             QStringLiteral("--directory"), root});
+        server.setProgram(QStringLiteral(PELMO_PYTHON3));
+        server.setArguments({QStringLiteral("-u"),
+                             QStringLiteral(PELMO_TEST_DIR "/controller/page_server.py"), root});
         server.start();
         static const QRegularExpression serving(QStringLiteral(R"(port (\d+))"));
         QByteArray said;
@@ -31,7 +29,9 @@ public:
         }
     }
     ~PageServer() {
-        server.kill();
+        server.closeWriteChannel(); // the server stops when its input closes
+        if (!server.waitForFinished(3000))
+            server.kill();
         server.waitForFinished();
     }
     QString url(const QString& path) const {
