@@ -2,7 +2,7 @@
 
 #include "addressbook/AddressBook.h"
 #include "attachments/AttachmentsController.h"
-#include "controller/HtmlCharset.h"
+#include "smtp/HtmlCharset.h"
 #include "controller/PasswordStore.h"
 #include "relink/Relink.h"
 #include "relink/SuffixMap.h"

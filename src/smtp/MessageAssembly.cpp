@@ -1,6 +1,6 @@
 #include "smtp/MessageAssembly.h"
 
-#include "controller/HtmlCharset.h"
+#include "smtp/HtmlCharset.h"
 #include "smtp/QuotedPrintable.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"

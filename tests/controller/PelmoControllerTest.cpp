@@ -2,7 +2,7 @@
 
 #include "RowName.h"
 
-#include "controller/HtmlCharset.h"
+#include "smtp/HtmlCharset.h"
 #include "util/CLog.h"
 #include "util/PelmoException.h"
 

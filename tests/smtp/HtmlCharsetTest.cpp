@@ -1,4 +1,4 @@
-#include "controller/HtmlCharset.h"
+#include "smtp/HtmlCharset.h"
 
 #include <QTextDocument>
 #include <gtest/gtest.h>

@@ -2,7 +2,7 @@
 
 #include <QGuiApplication>
 
-// The controller's body is a QTextDocument, whose HTML export needs a QGuiApplication.
+// A message body is a QTextDocument, whose HTML export needs a QGuiApplication.
 int main(int argc, char** argv) {
     return runTestsIn<QGuiApplication>(argc, argv);
 }
