@@ -4,6 +4,7 @@
 #include "util/DataFolder.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
+#include "util/PrivateFiles.h"
 
 #include <QHash>
 #include <QSet>
@@ -12,6 +13,9 @@
 #include <QSqlQuery>
 
 #include <atomic>
+#include <cerrno>
+#include <cstring>
+#include <filesystem>
 
 namespace {
 
@@ -88,6 +92,14 @@ AddressBook::~AddressBook() {
 }
 
 void AddressBook::open() {
+    // SQLite gives its journals the mode of the database file, so a book begun 0600 keeps the
+    // contacts from the other users in every file. A book that exists keeps the mode its
+    // owner gave it; the one in the data folder is tightened with the folder.
+    const std::filesystem::path file(filePath.toStdString());
+    std::error_code error;
+    if (!std::filesystem::exists(std::filesystem::symlink_status(file, error)) &&
+        !MakePrivateFile(file))
+        fail(QString::fromLocal8Bit(std::strerror(errno)));
     QSqlDatabase db = QSqlDatabase::addDatabase(QStringLiteral("QSQLITE"), connectionName);
     db.setDatabaseName(filePath);
     db.setConnectOptions(QStringLiteral("QSQLITE_BUSY_TIMEOUT=5000"));

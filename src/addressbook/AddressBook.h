@@ -31,9 +31,15 @@ struct ImportSummary {
  */
 class AddressBook {
 public:
-    /** Opens AddressBook.sqlite in the data folder, creating the folder and file when missing. */
+    /**
+     * Opens AddressBook.sqlite in the data folder, creating the folder and file when missing;
+     * the folder is private and the file 0600, as GetOurApplicationSupportFolder makes them.
+     */
     AddressBook();
-    /** Opens (creating when missing) the database file at path. */
+    /**
+     * Opens the database file at path, creating it with mode 0600 when missing. An existing file
+     * and the folder around it keep their modes.
+     */
     explicit AddressBook(const QString& path);
     ~AddressBook();
     AddressBook(const AddressBook&) = delete;

@@ -27,8 +27,9 @@ CLog::~CLog() {
 
 int CLog::open_log_file(const char* path) {
     fileRef = -1;
-    // O_APPEND puts every write at the end, as the log must never overwrite older runs.
-    const int fd = ::open(path, O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC, 0644);
+    // O_APPEND puts every write at the end, as the log must never overwrite older runs; 0600
+    // because the log tells who was mailed, which is for the user's eyes only.
+    const int fd = ::open(path, O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC, 0600);
     if (fd < 0)
         return errno;
     fileRef = fd;

@@ -17,8 +17,8 @@ public:
     CLog& operator=(const CLog&) = delete;
 
     /**
-     * Opens path for appending, creating it when missing, and writes the start marker.
-     * Answers 0 or an errno value; on failure the log stays closed.
+     * Opens path for appending, creating it with mode 0600 when missing, and writes the start
+     * marker. Answers 0 or an errno value; on failure the log stays closed.
      */
     int open_log_file(const char* path);
     /** Appends the string's bytes (no terminator, no line end added). 0 or an errno value. */

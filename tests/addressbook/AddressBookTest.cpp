@@ -2,12 +2,19 @@
 
 #include "util/PelmoException.h"
 
+#include "RowName.h"
+
 #include <QSqlDatabase>
 #include <QSqlQuery>
 #include <QTemporaryDir>
 #include <gtest/gtest.h>
 
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
 #include <memory>
+#include <string>
 
 namespace {
 
@@ -140,5 +147,63 @@ TEST(AddressBookFile, UnopenableFileIsANamedFailure) {
         EXPECT_TRUE(failure.reason().contains(QStringLiteral("/nonexistent-folder/")));
     }
 }
+
+struct BookFileRow {
+    std::string name;
+    bool inDataFolder; // or at a path in a 0755 folder of the user's
+    mode_t existing;   // the mode of an empty file already there; 0 for none
+    mode_t expected;
+};
+
+class BookFile : public ::testing::TestWithParam<BookFileRow> {
+protected:
+    void SetUp() override {
+        ASSERT_TRUE(home.isValid());
+        saved = qgetenv("XDG_DATA_HOME");
+        qputenv("XDG_DATA_HOME", home.path().toUtf8());
+        // With no umask to narrow them, the modes seen are the ones the code asked for.
+        savedMask = ::umask(0);
+        ASSERT_EQ(::mkdir(given().c_str(), 0755), 0);
+    }
+    void TearDown() override {
+        ::umask(savedMask);
+        qputenv("XDG_DATA_HOME", saved);
+    }
+    std::string given() const { return home.path().toStdString() + "/given"; }
+
+    static mode_t modeOf(const std::string& path) {
+        struct stat status {};
+        return ::stat(path.c_str(), &status) == 0 ? status.st_mode & 07777 : 0;
+    }
+
+    QTemporaryDir home;
+    QByteArray saved;
+    mode_t savedMask = 0;
+};
+
+TEST_P(BookFile, Mode) {
+    const BookFileRow& row = GetParam();
+    const std::string path = given() + "/AddressBook.sqlite";
+    if (row.existing != 0) {
+        const int fd = ::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL, row.existing);
+        ASSERT_GE(fd, 0);
+        ::close(fd);
+    }
+    std::unique_ptr<AddressBook> book =
+        row.inDataFolder ? std::make_unique<AddressBook>()
+                         : std::make_unique<AddressBook>(QString::fromStdString(path));
+    book->add({contact("Ada", "Lovelace", {"ada@example.org"})});
+    EXPECT_EQ(modeOf(book->path().toStdString()), row.expected);
+    // A folder the book did not make is the user's to set.
+    EXPECT_EQ(modeOf(given()), mode_t(0755));
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Modes, BookFile,
+    ::testing::Values(BookFileRow{"NewBookInTheDataFolderIs0600", true, 0, 0600},
+                      BookFileRow{"NewBookAtAPathIs0600", false, 0, 0600},
+                      // The user may share a book of their own on purpose.
+                      BookFileRow{"ExistingBookAtAPathKeepsItsMode", false, 0640, 0640}),
+    RowName());
 
 } // namespace
