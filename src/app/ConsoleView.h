@@ -30,7 +30,6 @@ public:
     QString sendButtonTitle() const override { return m_button; }
     void setSendButtonTitle(const QString& title) override { m_button = title; }
     void showRecipientsWindow() override {}
-    void reloadRecipients() override {}
     void alert(const QString& title, const QString& informativeText) override;
     void beep() override {}
 

@@ -3,6 +3,7 @@
 #include "addressbook/AddressBook.h"
 #include "app/ConsoleView.h"
 #include "attachments/AttachmentsController.h"
+#include "controller/MailSettings.h"
 #include "controller/PasswordStore.h"
 #include "controller/PelmoController.h"
 #include "smtp/DryRunSession.h"
@@ -23,25 +24,6 @@ constexpr char kUsage[] =
     "usage: pelmo send [--group NAME | --to ADDRESS [--name NAME]] [--subject TEXT]\n"
     "                  [--message FILE] [--page URL] [--attach FILE]... [--set KEY=VALUE]...\n"
     "                  [--dry-run DIR]\n";
-
-// The settings a run may override; anything else is most likely a typing mistake.
-const QStringList kSettingKeys = {
-    QStringLiteral("senderEmail"),
-    QStringLiteral("senderName"),
-    QStringLiteral("defaultRecipientEmail"),
-    QStringLiteral("defaultRecipientName"),
-    QStringLiteral("selectedContentType"),
-    QStringLiteral("selectedCharacterSet"),
-    QStringLiteral("selectedAuthentication"),
-    QStringLiteral("useSSL"),
-    QStringLiteral("serverAddress"),
-    QStringLiteral("serverPort"),
-    QStringLiteral("completionAction"),
-    QStringLiteral("loginUsername"),
-    QStringLiteral("loginPassword"),
-    QStringLiteral("smtpTimeout"),
-    QStringLiteral("implicitTLS"),
-};
 
 struct SendOptions {
     QString group, to, name, subject, messageFile, page, dryRunDirectory;
@@ -88,9 +70,10 @@ SendOptions parse(const QStringList& args) {
             const QString pair = valueAfter(args, i);
             const qsizetype equals = pair.indexOf(QLatin1Char('='));
             const QString key = pair.left(equals);
-            if (equals <= 0 || !kSettingKeys.contains(key))
+            // Anything but one of our keys is most likely a typing mistake.
+            if (equals <= 0 || !MailSettings::keyNamed(key))
                 throw UsageError(QStringLiteral("--set takes KEY=VALUE with KEY one of: %1")
-                                     .arg(kSettingKeys.join(QStringLiteral(", "))));
+                                     .arg(MailSettings::names().join(QStringLiteral(", "))));
             options.settings.append({key, pair.mid(equals + 1)});
         } else {
             throw UsageError(QStringLiteral("unknown option %1").arg(option));
@@ -139,7 +122,7 @@ void writeCopiesTo(PelmoController& controller, const QString& directory) {
 bool prepare(PelmoController& controller, AddressBook& book, const SendOptions& options) {
     PelmoView& view = controller.view();
     for (const auto& [key, value] : options.settings)
-        controller.overrideSetting(key, value);
+        controller.settings().overrideValue(*MailSettings::keyNamed(key), value);
     if (options.hasTo)
         view.setTo(options.to);
     if (options.hasName)
@@ -165,19 +148,13 @@ bool prepare(PelmoController& controller, AddressBook& book, const SendOptions& 
     return true;
 }
 
+// 0 when the run completed with every copy accepted.
 int runMailing(PelmoController& controller) {
-    bool completed = false;
-    int refused = 0;
-    QObject::connect(&controller, &PelmoController::runCompleted,
-                     [&completed] { completed = true; });
-    QObject::connect(&controller, &PelmoController::deliveryFinished, [&refused](bool accepted) {
-        if (!accepted)
-            ++refused;
-    });
-    QObject::connect(&controller, &PelmoController::runIdle, [] { QCoreApplication::exit(0); });
+    QObject::connect(&controller, &PelmoController::runSettled, [] { QCoreApplication::exit(0); });
     QMetaObject::invokeMethod(&controller, &PelmoController::send, Qt::QueuedConnection);
     QCoreApplication::exec();
-    return completed && refused == 0 ? 0 : 1;
+    const MailingRun* run = controller.currentRun();
+    return run && run->state() == MailingRun::State::Completed && run->everyCopyAccepted() ? 0 : 1;
 }
 
 } // namespace
@@ -201,8 +178,9 @@ int send(const QStringList& args) {
     try {
         ConsoleView view;
         AddressBook book;
+        MailSettings settings;
         PasswordStore passwords;
-        PelmoController controller(view, book, passwords);
+        PelmoController controller(view, book, passwords, settings);
         controller.startUp();
         controller.applicationWillFinishLaunching();
         const int status = prepare(controller, book, options) ? runMailing(controller) : 1;

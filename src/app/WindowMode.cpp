@@ -1,6 +1,7 @@
 #include "app/WindowMode.h"
 
 #include "addressbook/AddressBook.h"
+#include "controller/MailSettings.h"
 #include "controller/PasswordStore.h"
 #include "controller/PelmoController.h"
 #include "gui/MainWindow.h"
@@ -20,13 +21,19 @@ int runWindow() {
         QMessageBox::critical(nullptr, LocalizedStringNS("Pelmo cannot start"), failure.reason());
         return 1;
     }
+    MailSettings settings;
     PasswordStore passwords;
-    MainWindow window(*book, passwords);
-    PelmoController& controller = window.controller();
+    // The window is the controller's view, and shows what the controller holds: it is made
+    // first and goes first.
+    auto window = std::make_unique<MainWindow>(*book, passwords, settings);
+    PelmoController controller(*window, *book, passwords, settings);
+    window->setController(controller);
     controller.startUp();
     controller.applicationWillFinishLaunching();
-    window.show();
+    window->show();
     QObject::connect(qApp, &QCoreApplication::aboutToQuit, &controller,
                      &PelmoController::applicationWillTerminate);
-    return QApplication::exec();
+    const int status = QApplication::exec();
+    window.reset();
+    return status;
 }

@@ -1,5 +1,6 @@
 #include "app/Commands.h"
 #include "app/WindowMode.h"
+#include "util/AppIdentity.h"
 
 #include <QApplication>
 #include <QGuiApplication>
@@ -10,8 +11,8 @@
 namespace {
 
 void nameApplication() {
-    QCoreApplication::setOrganizationName(QStringLiteral("Orvale Software"));
-    QCoreApplication::setApplicationName(QStringLiteral("Pelmo"));
+    QCoreApplication::setOrganizationName(QString::fromLatin1(kOrganisationName));
+    QCoreApplication::setApplicationName(QString::fromLatin1(kApplicationName));
     QCoreApplication::setApplicationVersion(QStringLiteral(PELMO_VERSION));
 }
 

@@ -1,49 +1,48 @@
 #pragma once
 
 #include "addressbook/Person.h"
+#include "controller/MailingRun.h"
 #include "controller/PelmoView.h"
 
 #include <QList>
 #include <QObject>
 #include <QPointer>
-#include <QSet>
-#include <QSettings>
 #include <QString>
 #include <QStringList>
-#include <QVariant>
-#include <QVariantMap>
 
-#include <functional>
 #include <optional>
 
 class AddressBook;
 class AttachmentsController;
-class SMTP;
-class SmtpSession;
+class MailSettings;
+class MessageTemplate;
 class PasswordStore;
+
 class QTextDocument;
+class RecipientSelection;
+class SentRecipients;
 
 /**
- * The mailing controller: the settings and their validation, the message body and its tags,
- * the recipients chosen from the address book and those already mailed. It reaches its
- * window only through PelmoView, so the desktop window, the command line and the tests drive
- * the same code.
+ * The mailing controller: what the window and the command line drive. It holds the message,
+ * the recipient selection, the sent list and the attachments, starts a MailingRun at each
+ * press of Send, and shows every status line on the view and in the activity log. The window
+ * reaches it only through these calls and the models it hands out, and it reaches the window
+ * only through PelmoView.
  *
- * The view, the address book and the password store are not owned and must outlive the
- * controller. Main thread only.
+ * The view, the address book, the password store and the settings are not owned and must
+ * outlive the controller. Main thread only.
  */
 class PelmoController : public QObject {
     Q_OBJECT
 
 public:
     PelmoController(PelmoView& view, AddressBook& addressBook, PasswordStore& passwords,
-                    QObject* parent = nullptr);
+                    MailSettings& settings, QObject* parent = nullptr);
     ~PelmoController() override;
 
     /**
-     * Start-up, once the view stands: no pending selection, an empty sent-recipients list,
-     * the To and Name fields filled from the default-recipient settings that are present,
-     * status "Ready.".
+     * Start-up, once the view stands: no pending selection, an empty sent list, the To and
+     * Name fields filled from the default-recipient settings that are present, "Ready.".
      */
     void startUp();
     /** The application is about to finish launching: starts the activity log. */
@@ -51,106 +50,32 @@ public:
     /** The application terminates: stops the activity log. */
     void applicationWillTerminate();
 
-    /** The message body; owned by the controller, shared with the window's editor. */
-    QTextDocument* message() const { return body; }
-    /** The window the controller drives. */
     PelmoView& view() const { return window; }
-
-    /**
-     * Makes value stand for the setting key until the controller goes, without writing it to
-     * the settings file: one run from the command line with another server or port.
-     */
-    void overrideSetting(const QString& key, const QVariant& value);
-
-    // The mailing run. One delivery (an SMTP object) at a time: the next person's starts when
-    // the previous connection has closed.
-
-    /**
-     * The Send/Stop button: fetches the web page, then either stops the run (the button
-     * reads "Stop") or starts one, over the pending selection or to the To field.
-     */
-    void send();
-    /**
-     * Takes the next pending person, fills To and Name, and starts their delivery when they
-     * have an address. False when the run was stopped or no one is left (the run then ends).
-     */
-    bool sendMember();
-    /** Stops the run after the delivery in progress; the persons not yet mailed stay pending. */
-    void abort();
-    /** A new session for one delivery, made by the session factory. Owned by the caller. */
-    SmtpSession* createSession(const QString& host, int port);
-    using SessionFactory = std::function<SmtpSession*(const QString& host, int port)>;
-    /** Replaces how sessions are made (a dry run writes files; tests hand in their own). */
-    void setSessionFactory(SessionFactory factory);
-
-    // The message source.
-
-    /** The web page field's page, downloaded and relinked; null when there is none. */
-    QString getWebPageOrFile();
-    /** This run's page with the tags replaced for the current recipient; null without a page. */
-    QString getWebPageOrFileContents();
-    /** The list of files attached to every message; owned by the controller. */
+    MailSettings& settings() const { return defaults; }
+    /** The message body, shared with the window's editor. */
+    QTextDocument* message() const;
+    MessageTemplate& messageTemplate() const { return *content; }
+    RecipientSelection& selection() const { return *recipientSelection; }
+    /** The sent-recipients list, a model the Sent Recipients window shows. */
+    SentRecipients& sentRecipients() const { return *recipients; }
+    /** The files every message carries. */
     AttachmentsController& getAttachments() const { return *attachments; }
 
-    // Settings and fields. Every getter that reads a setting syncs the settings store first,
-    // so a change saved by the preferences (or another process) is seen by the next call.
-    // Those marked "throws" raise PelmoException with the failure's name and reason.
+    // The run.
 
-    /** "senderEmail"; throws NoSenderEmailAddress when missing or empty. */
-    QString getFrom();
-    /** "senderName"; throws NoSenderName. */
-    QString getFromName();
-    /** The To field; throws NoRecipientsEmail when empty. */
-    QString getTo();
-    /** The Name field; throws NoRecipientsName when empty. */
-    QString getToName();
-    /** The Subject field as it stands, maybe empty. */
-    QString getSubject();
-    /** "serverAddress"; throws NoServer. */
-    QString getServer();
-    /** "serverPort", 1 to 65365 inclusive; throws BadPort otherwise (a missing port is 0). */
-    int getPort();
-    /** "loginUsername"; throws NoUsername. */
-    QString getUsername();
     /**
-     * The system keyring's password when it answers with one, else "loginPassword"; throws
-     * NoPassword when neither has one. Never logged.
+     * The Send/Stop button: stops the run when the button reads "Stop", else starts one over
+     * the pending selection or to the To field.
      */
-    QString getPassword();
-    /** "defaultRecipientEmail", null when not set. */
-    QString getDefaultTo();
-    /** "defaultRecipientName", null when not set. */
-    QString getDefaultToName();
-    /** "selectedContentType": 0 HTML, 1 plain text, else no typed body; 0 when missing. */
-    int getSelectedContentType();
-    /** "selectedCharacterSet": 0 UTF-8, 1 US-ASCII, 2 ISO-8859-1, 3 Shift_JIS. */
-    int getSelectedCharacterSet();
-    /** "selectedAuthentication": 0 none, 1 PLAIN, 2 LOGIN, 3 CRAM-MD5. */
-    int getSelectedLoginMechanism();
-    /** "useSSL", false when missing. */
-    bool useSSL();
-    /** "completionAction": 0 nothing, 1 quit, 2 reset. */
-    int completionAction();
+    void send();
+    /** Stops the run after the delivery in progress; the persons not yet mailed stay pending. */
+    void abort();
+    /** The run of the latest press of Send, null before the first. */
+    MailingRun* currentRun() const { return run; }
+    /** Replaces how sessions are made (a dry run writes files; tests hand in their own). */
+    void setSessionFactory(MailingRun::SessionFactory factory);
 
-    // Message content.
-
-    /** The body's plain text with the tags replaced; throws what the tag getters throw. */
-    QString getMessage();
-    /**
-     * The body as an HTML document in the chosen character set (see HtmlCharset), with the
-     * tags replaced: a QString every character of which that set holds, so that
-     * HtmlCharset::forIndex(getSelectedCharacterSet()).encode() gives its bytes without loss.
-     * Null when the export fails; throws what the tag getters throw.
-     */
-    QString getHTMLMessage();
-    /**
-     * text with "{to}", "{toName}", "{from}", "{fromName}" and "{subject}" replaced in any
-     * letter case by their getters' values. Every getter is called on every call, whether or
-     * not its tag occurs, so their failures stop the message. Null for null text.
-     */
-    QString replaceTags(const QString& text);
-
-    // Status, alerts and the activity log.
+    // Status, alerts, the log.
 
     /** Shows text on the status line and appends it to the activity log. */
     void statusMsg(const QString& text);
@@ -161,85 +86,65 @@ public:
     /** Clears the form for a new message: empty body and subject, default recipient. */
     void reset();
 
+    // Settings and fields; those marked "throws" raise PelmoException with the failure's name
+    // and reason.
+
+    /** The sender's address; throws NoSenderEmailAddress. */
+    QString getFrom();
+    /** The sender's name; throws NoSenderName. */
+    QString getFromName();
+    /** The To field; throws NoRecipientsEmail. */
+    QString getTo();
+    /** The Name field; throws NoRecipientsName. */
+    QString getToName();
+    QString getSubject();
+    /** The server's address; throws NoServer. */
+    QString getServer();
+    /** The server's port, 1 to 65365; throws BadPort. */
+    int getPort();
+    /** The login name; throws NoUsername. */
+    QString getUsername();
+    /** The default recipient's address, null when not set. */
+    QString getDefaultTo();
+    /** The default recipient's name, null when not set. */
+    QString getDefaultToName();
+    int getSelectedContentType();
+    int getSelectedCharacterSet();
+    int getSelectedLoginMechanism();
+    bool useSSL();
+    int completionAction();
+
     // Recipients.
 
-    /** The persons still to be mailed; nullopt when no group selection is pending. */
-    const std::optional<QList<Person>>& getPeople() const { return people; }
-    /** Makes persons the pending selection (a group chosen other than in the picker). */
-    void setPeople(const QList<Person>& persons);
-    /** Drops from the pending selection every person whose primary address was mailed. */
-    void filterPeopleByRecipients();
-    /** True when address was mailed, ignoring letter case only (nothing is trimmed). */
+    const std::optional<QList<Person>>& getPeople() const;
     bool recipientsContains(const QString& address) const;
-    /** Records address as mailed. */
-    void addRecipient(const QString& address);
-    /** Forgets every mailed address. */
     void resetRecipients();
 
-    // The sent-recipients table: column "index" shows the row number from 1, "email" the
-    // address; anything else, or a row out of range, shows nothing (an invalid QVariant).
-    int numberOfRows() const { return static_cast<int>(recipients.size()); }
-    QVariant valueFor(const QString& column, int row) const;
-
 public Q_SLOTS:
-    /**
-     * The picker's group selection changed (groups in the picker's order). Only the first
-     * group counts: its members, less those already mailed, become the pending selection.
-     * pickerIsKeyWindow tells that the user made the change in the picker, which then also
-     * shows the group's name in the To and Name fields.
-     */
+    /** The picker's group selection changed; see RecipientSelection. */
     void abGroupSelected(const QList<qint64>& groupIds, bool pickerIsKeyWindow);
-    /**
-     * The picker's person selection, selected address or displayed property changed. A
-     * person selection means one message: the pending selection is dropped. When the user
-     * made the change in the picker, the first person's "first last" name goes to the Name
-     * field and the first selected address (else the person's primary one) to the To field.
-     */
+    /** The picker's person or address selection changed; see RecipientSelection. */
     void abRecordSelected(const QList<qint64>& personIds, const QStringList& selectedAddresses,
                           bool pickerIsKeyWindow);
-    /**
-     * The user edited a field: editing To or Name drops the pending group selection. Text the
-     * controller puts in a field is no edit and must not be reported.
-     */
+    /** The user edited a field (never text the controller put there). */
     void textDidChange(PelmoView::Field field);
 
 Q_SIGNALS:
-    /** The sent-recipients list changed. */
-    void recipientsChanged();
-    /** The run reached its end: every pending person was taken. */
-    void runCompleted();
-    /** One delivery will start nothing more; accepted when the server took its message. */
-    void deliveryFinished(bool accepted);
-    /** Nothing is in progress any more: the run is over, stopped or halted. */
-    void runIdle();
+    /** The latest run has nothing under way any more: it is over, stopped, stalled or halted. */
+    void runSettled();
 
 private:
-    QString requiredSetting(const char* key, const char* failureName, const char* reason);
-    QString stringSetting(const char* key);
-    int integerSetting(const char* key);
-    QVariant setting(const char* key);
-    static QString replaceTagsInTurn(const QString& text, const QStringList& values);
-    static QString replaceTagsInOnePass(const QString& text, const QStringList& values);
-    void recipientsDidChange();
-    void startDelivery();
-    void endRun();
+    SmtpSession* createSession(const QString& host, int port);
+    void applyCompletionAction(int action);
 
     PelmoView& window;
     AddressBook& addressBook;
     PasswordStore& passwords;
-    QSettings defaults;
-    QTextDocument* body;
-    /** body as plain text, null until asked for after a change. */
-    QString plainBody;
-    std::optional<QList<Person>> people;
-    QStringList recipients;
-    /** recipients case-folded, so that recipientsContains need not walk the list. */
-    QSet<QString> foldedRecipients;
-    QVariantMap overrides;
-    bool stopSending = false;
-    QString webPageOrFileContents;
+    MailSettings& defaults;
+    MessageTemplate* content;
+    SentRecipients* recipients;
+    RecipientSelection* recipientSelection;
     AttachmentsController* attachments;
-    SessionFactory sessionFactory;
-    /** The latest delivery started; a finished one that is still the latest leaves the run idle. */
-    QPointer<SMTP> currentDelivery;
+    MailingRun::SessionFactory sessionFactory;
+    QPointer<MailingRun> run;
 };

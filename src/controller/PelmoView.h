@@ -44,8 +44,6 @@ public:
 
     /** Brings the sent-recipients window to the front. */
     virtual void showRecipientsWindow() = 0;
-    /** The sent-recipients list changed: the table asks the controller for its rows again. */
-    virtual void reloadRecipients() = 0;
 
     /** Shows a problem the user must act on: a short title and an explanation, one OK button. */
     virtual void alert(const QString& title, const QString& informativeText) = 0;

@@ -43,9 +43,9 @@ QIcon icon(const char* themeName, QStyle::StandardPixmap fallback) {
 
 } // namespace
 
-MainWindow::MainWindow(AddressBook& addressBook, PasswordStore& passwords, QWidget* parent)
-    : QMainWindow(parent), m_passwords(passwords),
-      m_controller(std::make_unique<PelmoController>(*this, addressBook, passwords)) {
+MainWindow::MainWindow(AddressBook& addressBook, PasswordStore& passwords, MailSettings& settings,
+                       QWidget* parent)
+    : QMainWindow(parent), m_passwords(passwords), m_settings(settings) {
     setWindowTitle(LocalizedStringNS("Pelmo"));
     auto* central = new QWidget;
     auto* layout = new QVBoxLayout(central);
@@ -54,36 +54,36 @@ MainWindow::MainWindow(AddressBook& addressBook, PasswordStore& passwords, QWidg
     layout->addWidget(createSendRow());
     setCentralWidget(central);
 
-    m_recipients = new RecipientsWindow(*m_controller, this);
     m_picker = new PeoplePicker(addressBook, this);
-    // The window shows the controller's own list, which every message carries as it stands.
-    m_attachmentsWindow = new AttachmentsWindow(m_controller->getAttachments(), this);
-    createActions();
-    connectPicker();
     showProgress();
     resize(860, 640);
+}
+
+void MainWindow::setController(PelmoController& controller) {
+    m_controller = &controller;
+    m_message->setDocument(controller.message());
+    m_recipients = new RecipientsWindow(controller.sentRecipients(), this);
+    // The window shows the controller's own list, which every message carries as it stands.
+    m_attachmentsWindow = new AttachmentsWindow(controller.getAttachments(), this);
+    reportEdits(m_to, PelmoView::Field::To);
+    reportEdits(m_name, PelmoView::Field::Name);
+    reportEdits(m_subject, PelmoView::Field::Subject);
+    connect(m_sendButton, &QPushButton::clicked, &controller, &PelmoController::send);
+    createActions();
+    connectPicker();
 }
 
 AttachmentsController& MainWindow::attachments() const {
     return m_controller->getAttachments();
 }
 
-MainWindow::~MainWindow() {
-    // The editor and the tables show what the controller holds, and the controller (a member)
-    // goes first: the widgets that show it go before.
-    delete m_attachmentsWindow;
-    delete m_recipients;
-    delete centralWidget();
-}
+MainWindow::~MainWindow() = default;
 
 QWidget* MainWindow::createFields() {
     m_to = lineEdit("to", "someone@example.org");
     m_name = lineEdit("name", "First Last");
     m_subject = lineEdit("subject", "What the message is about");
     m_webPageOrFile = lineEdit("webPageOrFile", "https://... (a page to mail with every copy)");
-    reportEdits(m_to, PelmoView::Field::To);
-    reportEdits(m_name, PelmoView::Field::Name);
-    reportEdits(m_subject, PelmoView::Field::Subject);
 
     auto* fields = new QWidget;
     auto* form = new QFormLayout(fields);
@@ -97,14 +97,13 @@ QWidget* MainWindow::createFields() {
 }
 
 void MainWindow::reportEdits(QLineEdit* edit, PelmoView::Field field) {
-    connect(edit, &QLineEdit::textEdited, m_controller.get(),
+    connect(edit, &QLineEdit::textEdited, m_controller,
             [this, field] { m_controller->textDidChange(field); });
 }
 
 QWidget* MainWindow::createEditor() {
     m_message = new QTextEdit;
     m_message->setObjectName(QStringLiteral("message"));
-    m_message->setDocument(m_controller->message());
     m_message->setAcceptRichText(true);
     m_message->setPlaceholderText(
         LocalizedStringNS("Write the message here. {toName}, {to}, {fromName}, {from} and "
@@ -138,7 +137,6 @@ QWidget* MainWindow::createSendRow() {
     m_sendButton->setDefault(true);
     m_sendButton->setMinimumWidth(96);
     m_sendButton->setToolTip(LocalizedStringNS("Send the message (Ctrl+Return)"));
-    connect(m_sendButton, &QPushButton::clicked, m_controller.get(), &PelmoController::send);
     auto* shortcut = new QShortcut(QKeySequence(Qt::CTRL | Qt::Key_Return), this);
     connect(shortcut, &QShortcut::activated, m_sendButton, &QPushButton::click);
 
@@ -165,7 +163,7 @@ void MainWindow::createActions() {
                                 LocalizedStringNS("Console"), this);
     console->setObjectName(QStringLiteral("consoleAction"));
     console->setToolTip(LocalizedStringNS("Show the activity log"));
-    connect(console, &QAction::triggered, m_controller.get(), &PelmoController::openConsole);
+    connect(console, &QAction::triggered, m_controller, &PelmoController::openConsole);
     auto* attachments = new QAction(icon("mail-attachment", QStyle::SP_FileIcon),
                                     LocalizedStringNS("Attachments"), this);
     attachments->setObjectName(QStringLiteral("attachmentsAction"));
@@ -191,7 +189,7 @@ void MainWindow::createActions() {
 }
 
 void MainWindow::connectPicker() {
-    PelmoController* controller = m_controller.get();
+    PelmoController* controller = m_controller;
     connect(m_picker, &PeoplePicker::groupSelectionChanged, controller,
             &PelmoController::abGroupSelected);
     for (auto signal : {&PeoplePicker::nameSelectionChanged, &PeoplePicker::valueSelectionChanged,
@@ -297,10 +295,6 @@ void MainWindow::showRecipientsWindow() {
     m_recipients->activateWindow();
 }
 
-void MainWindow::reloadRecipients() {
-    m_recipients->reload();
-}
-
 void MainWindow::alert(const QString& title, const QString& informativeText) {
     openAlert(this, title, informativeText);
 }
@@ -323,7 +317,7 @@ void MainWindow::showAttachments() {
 
 void MainWindow::showPreferences() {
     if (!m_preferences)
-        m_preferences = new PreferencesDialog(m_passwords, this);
+        m_preferences = new PreferencesDialog(m_passwords, m_settings, this);
     m_preferences->load();
     m_preferences->open();
 }

@@ -4,11 +4,10 @@
 
 #include <QMainWindow>
 
-#include <memory>
-
 class AddressBook;
 class AttachmentsController;
 class AttachmentsWindow;
+class MailSettings;
 class PasswordStore;
 class PelmoController;
 class PeoplePicker;
@@ -25,21 +24,24 @@ class RecipientsWindow;
  * web page fields, the Send/Stop button, the progress bar and the status line, and the buttons
  * that open the preferences, the people picker, the attachments and the activity log.
  *
- * The window owns its controller and drives it only by forwarding: each button calls the
+ * The window is the controller's view and drives it only by forwarding: each button calls the
  * controller's action, each user edit of a field is reported with textDidChange, and the
  * controller shows its progress through the PelmoView calls. The editor shares the
- * controller's message document. The window owns the attachments list and hands each change
- * of it to the controller. The people picker, the sent-recipients window, the attachments
- * window and the preferences dialog are separate windows owned by this one. The address book
- * and the password store are not owned and must outlive the window.
+ * controller's message document, and the attachments and sent-recipients windows show the
+ * controller's own list and model. Those two, the people picker and the preferences dialog
+ * are separate windows owned by this one. The controller, the address book, the password
+ * store and the settings are not owned and must outlive the window.
  */
 class MainWindow : public QMainWindow, public PelmoView {
     Q_OBJECT
 
 public:
-    MainWindow(AddressBook& addressBook, PasswordStore& passwords, QWidget* parent = nullptr);
+    MainWindow(AddressBook& addressBook, PasswordStore& passwords, MailSettings& settings,
+               QWidget* parent = nullptr);
     ~MainWindow() override;
 
+    /** Connects the window to the controller whose view it is; once, before it is shown. */
+    void setController(PelmoController& controller);
     PelmoController& controller() const { return *m_controller; }
     PeoplePicker& peoplePicker() const { return *m_picker; }
     RecipientsWindow& recipientsWindow() const { return *m_recipients; }
@@ -64,7 +66,6 @@ public:
     QString sendButtonTitle() const override;
     void setSendButtonTitle(const QString& title) override;
     void showRecipientsWindow() override;
-    void reloadRecipients() override;
     /** A window-modal message box on this window; the call returns at once. */
     void alert(const QString& title, const QString& informativeText) override;
     void beep() override;
@@ -87,7 +88,8 @@ private:
     void showProgress();
 
     PasswordStore& m_passwords;
-    std::unique_ptr<PelmoController> m_controller;
+    MailSettings& m_settings;
+    PelmoController* m_controller = nullptr;
     QLineEdit* m_subject = nullptr;
     QLineEdit* m_to = nullptr;
     QLineEdit* m_name = nullptr;

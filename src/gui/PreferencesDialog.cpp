@@ -17,11 +17,17 @@
 
 namespace {
 
-const QString kPasswordKey = QStringLiteral("loginPassword");
+using Key = MailSettings::Key;
+
 constexpr char kKeyProperty[] = "settingsKey";
 
-QString keyOf(const QWidget* widget) {
-    return widget->property(kKeyProperty).toString();
+Key keyOf(const QWidget* widget) {
+    return static_cast<Key>(widget->property(kKeyProperty).toInt());
+}
+
+void nameAfter(QWidget* widget, Key key) {
+    widget->setObjectName(MailSettings::name(key));
+    widget->setProperty(kKeyProperty, static_cast<int>(key));
 }
 
 QGroupBox* groupBox(const char* title, QFormLayout*& form) {
@@ -33,9 +39,9 @@ QGroupBox* groupBox(const char* title, QFormLayout*& form) {
 
 } // namespace
 
-PreferencesDialog::PreferencesDialog(PasswordStore& passwords, QWidget* parent)
-    : QDialog(parent), m_passwords(passwords),
-      m_settings(QStringLiteral("Orvale Software"), QStringLiteral("Pelmo")) {
+PreferencesDialog::PreferencesDialog(PasswordStore& passwords, MailSettings& settings,
+                                     QWidget* parent)
+    : QDialog(parent), m_passwords(passwords), m_settings(settings) {
     setWindowTitle(LocalizedStringNS("Preferences"));
     setWindowModality(Qt::WindowModal);
     auto* left = new QVBoxLayout;
@@ -62,10 +68,9 @@ PreferencesDialog::PreferencesDialog(PasswordStore& passwords, QWidget* parent)
     layout->addWidget(buttons);
 }
 
-QLineEdit* PreferencesDialog::addText(QFormLayout* form, const char* label, const char* key) {
+QLineEdit* PreferencesDialog::addText(QFormLayout* form, const char* label, Key key) {
     auto* edit = new QLineEdit;
-    edit->setObjectName(QLatin1String(key));
-    edit->setProperty(kKeyProperty, QLatin1String(key));
+    nameAfter(edit, key);
     edit->setMinimumWidth(220);
     form->addRow(LocalizedStringNS(label), edit);
     m_texts << edit;
@@ -74,11 +79,10 @@ QLineEdit* PreferencesDialog::addText(QFormLayout* form, const char* label, cons
 
 // A choice stores the index of its item; a stored index without an item shows blank and is
 // kept as it is.
-QComboBox* PreferencesDialog::addChoice(QFormLayout* form, const char* label, const char* key,
+QComboBox* PreferencesDialog::addChoice(QFormLayout* form, const char* label, Key key,
                                         const QList<const char*>& items) {
     auto* combo = new QComboBox;
-    combo->setObjectName(QLatin1String(key));
-    combo->setProperty(kKeyProperty, QLatin1String(key));
+    nameAfter(combo, key);
     for (const char* item : items)
         combo->addItem(LocalizedStringNS(item));
     form->addRow(LocalizedStringNS(label), combo);
@@ -89,8 +93,8 @@ QComboBox* PreferencesDialog::addChoice(QFormLayout* form, const char* label, co
 QGroupBox* PreferencesDialog::createSender() {
     QFormLayout* form = nullptr;
     QGroupBox* box = groupBox("Sender", form);
-    addText(form, "Name:", "senderName");
-    addText(form, "Email Address:", "senderEmail")
+    addText(form, "Name:", Key::SenderName);
+    addText(form, "Email Address:", Key::SenderEmail)
         ->setPlaceholderText(QStringLiteral("me@example.org"));
     return box;
 }
@@ -98,29 +102,29 @@ QGroupBox* PreferencesDialog::createSender() {
 QGroupBox* PreferencesDialog::createRecipient() {
     QFormLayout* form = nullptr;
     QGroupBox* box = groupBox("Default Recipient", form);
-    addText(form, "Name:", "defaultRecipientName");
-    addText(form, "Email Address:", "defaultRecipientEmail");
+    addText(form, "Name:", Key::DefaultRecipientName);
+    addText(form, "Email Address:", Key::DefaultRecipientEmail);
     return box;
 }
 
 QGroupBox* PreferencesDialog::createServer() {
     QFormLayout* form = nullptr;
     QGroupBox* box = groupBox("Outgoing SMTP Server", form);
-    addText(form, "Address:", "serverAddress")
+    addText(form, "Address:", Key::ServerAddress)
         ->setPlaceholderText(QStringLiteral("smtp.example.org"));
     m_port = new QSpinBox;
-    m_port->setObjectName(QStringLiteral("serverPort"));
+    nameAfter(m_port, Key::ServerPort);
     m_port->setRange(0, 65535);
     m_port->setToolTip(LocalizedStringNS("25 or 587 for STARTTLS, 465 for SSL from the start"));
     form->addRow(LocalizedStringNS("Port:"), m_port);
     m_useSSL = new QCheckBox(LocalizedStringNS("Use SSL"));
-    m_useSSL->setObjectName(QStringLiteral("useSSL"));
+    nameAfter(m_useSSL, Key::UseSSL);
     form->addRow(QString(), m_useSSL);
-    addChoice(form, "Authentication:", "selectedAuthentication",
+    addChoice(form, "Authentication:", Key::SelectedAuthentication,
               {"None", "PLAIN", "LOGIN", "CRAM-MD5"});
-    addText(form, "Username:", "loginUsername");
+    addText(form, "Username:", Key::LoginUsername);
     m_password = new QLineEdit;
-    m_password->setObjectName(kPasswordKey);
+    nameAfter(m_password, Key::LoginPassword);
     m_password->setEchoMode(QLineEdit::Password);
     form->addRow(LocalizedStringNS("Password:"), m_password);
     m_passwordNote = new QLabel;
@@ -136,9 +140,9 @@ QGroupBox* PreferencesDialog::createServer() {
 QGroupBox* PreferencesDialog::createMessage() {
     QFormLayout* form = nullptr;
     QGroupBox* box = groupBox("Message", form);
-    addChoice(form, "Format:", "selectedContentType",
+    addChoice(form, "Format:", Key::SelectedContentType,
               {"Rich text (HTML)", "Plain text", "No typed text"});
-    addChoice(form, "Character set:", "selectedCharacterSet",
+    addChoice(form, "Character set:", Key::SelectedCharacterSet,
               {"Unicode (UTF-8)", "ASCII", "Western (ISO-8859-1)", "Japanese (Shift_JIS)"});
     return box;
 }
@@ -146,65 +150,72 @@ QGroupBox* PreferencesDialog::createMessage() {
 QGroupBox* PreferencesDialog::createCompletion() {
     QFormLayout* form = nullptr;
     QGroupBox* box = groupBox("When Mailing Completes", form);
-    addChoice(form, "Then:", "completionAction", {"Do nothing", "Quit Pelmo", "Clear the message"});
+    addChoice(form, "Then:", Key::CompletionAction,
+              {"Do nothing", "Quit Pelmo", "Clear the message"});
     return box;
 }
 
 void PreferencesDialog::load() {
     m_settings.sync();
     for (QLineEdit* edit : std::as_const(m_texts))
-        edit->setText(m_settings.value(keyOf(edit)).toString());
+        edit->setText(m_settings.string(keyOf(edit)));
     for (QComboBox* combo : std::as_const(m_choices)) {
-        const int index = m_settings.value(keyOf(combo)).toInt();
+        const int index = m_settings.integer(keyOf(combo));
         combo->setCurrentIndex(index >= 0 && index < combo->count() ? index : -1);
     }
-    m_port->setValue(m_settings.value(QStringLiteral("serverPort"), 25).toInt());
-    m_useSSL->setChecked(m_settings.value(QStringLiteral("useSSL")).toBool());
+    m_port->setValue(m_settings.contains(Key::ServerPort)
+                         ? m_settings.integer(Key::ServerPort)
+                         : MailSettings::suggested(Key::ServerPort).toInt());
+    m_useSSL->setChecked(m_settings.boolean(Key::UseSSL));
     loadPassword();
 }
 
 void PreferencesDialog::loadPassword() {
-    const QString fromKeyring = m_passwords.readPassword(kPasswordKey);
-    const bool inKeyring = !fromKeyring.isEmpty();
-    m_loadedPassword = inKeyring ? fromKeyring : m_settings.value(kPasswordKey).toString();
+    // Until the keyring answers, the field shows what the settings file holds.
+    m_loadedPassword = m_settings.string(Key::LoginPassword);
     m_password->setText(m_loadedPassword);
-    tellWherePasswordIs(!m_loadedPassword.isEmpty(), inKeyring);
+    tellWherePasswordIs(!m_loadedPassword.isEmpty(), false);
+    m_passwords.readPassword(
+        MailSettings::name(Key::LoginPassword), this, [this](const QString& fromKeyring) {
+            // A password typed meanwhile is the user's, and stays.
+            if (fromKeyring.isEmpty() || m_password->text() != m_loadedPassword)
+                return tellWherePasswordIs(!m_loadedPassword.isEmpty(), false);
+            m_loadedPassword = fromKeyring;
+            m_password->setText(fromKeyring);
+            tellWherePasswordIs(true, true);
+        });
 }
 
 void PreferencesDialog::save() {
-    for (const QLineEdit* edit : std::as_const(m_texts)) {
-        const QString text = edit->text().trimmed();
-        if (text.isEmpty())
-            m_settings.remove(keyOf(edit));
-        else
-            m_settings.setValue(keyOf(edit), text);
-    }
+    for (const QLineEdit* edit : std::as_const(m_texts))
+        m_settings.setValue(keyOf(edit), edit->text().trimmed());
     for (const QComboBox* combo : std::as_const(m_choices)) {
         if (combo->currentIndex() >= 0)
             m_settings.setValue(keyOf(combo), combo->currentIndex());
     }
-    m_settings.setValue(QStringLiteral("serverPort"), m_port->value());
-    m_settings.setValue(QStringLiteral("useSSL"), m_useSSL->isChecked());
+    m_settings.setValue(Key::ServerPort, m_port->value());
+    m_settings.setValue(Key::UseSSL, m_useSSL->isChecked());
     if (m_password->text() != m_loadedPassword)
         savePassword();
-    m_settings.sync();
 }
 
 void PreferencesDialog::savePassword() {
     const QString password = m_password->text();
-    bool inKeyring = false;
-    if (password.isEmpty()) {
-        m_passwords.deletePassword(kPasswordKey);
-        m_settings.remove(kPasswordKey);
-    } else if (m_passwords.writePassword(kPasswordKey, password)) {
-        // The keyring holds it now: no copy stays in the settings file in plain text.
-        m_settings.remove(kPasswordKey);
-        inKeyring = true;
-    } else {
-        m_settings.setValue(kPasswordKey, password);
-    }
+    const QString key = MailSettings::name(Key::LoginPassword);
     m_loadedPassword = password;
-    tellWherePasswordIs(!password.isEmpty(), inKeyring);
+    if (password.isEmpty()) {
+        m_settings.remove(Key::LoginPassword);
+        m_passwords.deletePassword(key, this, [](bool) {});
+        return tellWherePasswordIs(false, false);
+    }
+    m_passwords.writePassword(key, password, this, [this, password](bool inKeyring) {
+        if (inKeyring)
+            // The keyring holds it now: no copy stays in the settings file in plain text.
+            m_settings.remove(Key::LoginPassword);
+        else
+            m_settings.setValue(Key::LoginPassword, password);
+        tellWherePasswordIs(true, inKeyring);
+    });
 }
 
 void PreferencesDialog::tellWherePasswordIs(bool stored, bool inKeyring) {

@@ -1,7 +1,8 @@
 #pragma once
 
+#include "controller/MailSettings.h"
+
 #include <QDialog>
-#include <QSettings>
 
 class PasswordStore;
 class QCheckBox;
@@ -15,16 +16,18 @@ class QSpinBox;
 /**
  * The preferences: sender, default recipient, outgoing server with its login, message format
  * and what to do when a mailing completes, each kept under its settings key. The password goes
- * to the system keyring when one answers, else to the settings key "loginPassword"; the dialog
+ * to the system keyring when one answers, else to the settings file; the dialog
  * says which. Values are stored as typed: the controller checks them when it mails.
  *
- * Owned by its parent (the main window); the password store is not owned.
+ * The keyring answers in the background: the password field fills in, and the note changes,
+ * when it has. Owned by its parent (the main window); the password store and the settings are
+ * not owned.
  */
 class PreferencesDialog : public QDialog {
     Q_OBJECT
 
 public:
-    PreferencesDialog(PasswordStore& passwords, QWidget* parent);
+    PreferencesDialog(PasswordStore& passwords, MailSettings& settings, QWidget* parent);
 
     /** Shows the settings as they are now stored. */
     void load();
@@ -38,15 +41,15 @@ private:
     QGroupBox* createServer();
     QGroupBox* createMessage();
     QGroupBox* createCompletion();
-    QLineEdit* addText(QFormLayout* form, const char* label, const char* key);
-    QComboBox* addChoice(QFormLayout* form, const char* label, const char* key,
+    QLineEdit* addText(QFormLayout* form, const char* label, MailSettings::Key key);
+    QComboBox* addChoice(QFormLayout* form, const char* label, MailSettings::Key key,
                          const QList<const char*>& items);
     void loadPassword();
     void savePassword();
     void tellWherePasswordIs(bool stored, bool inKeyring);
 
     PasswordStore& m_passwords;
-    QSettings m_settings;
+    MailSettings& m_settings;
     QList<QLineEdit*> m_texts;
     QList<QComboBox*> m_choices;
     QSpinBox* m_port = nullptr;

@@ -2,26 +2,23 @@
 
 #include <QWidget>
 
-class PelmoController;
 class QTableView;
-class RecipientsModel;
+class SentRecipients;
 
 /**
  * The "sent recipients" window: every address mailed since Pelmo started, numbered, and a
- * Reset button that makes the controller forget them. A separate window owned by its parent
- * (the main window); the controller is not owned.
+ * Reset button that forgets them. It shows the controller's list model as it changes, scrolled
+ * to the latest address. A separate window owned by its parent (the main window); the list
+ * is not owned and must outlive it.
  */
 class RecipientsWindow : public QWidget {
     Q_OBJECT
 
 public:
-    RecipientsWindow(PelmoController& controller, QWidget* parent);
+    RecipientsWindow(SentRecipients& recipients, QWidget* parent);
 
-    RecipientsModel& model() const { return *m_model; }
-    /** Shows the controller's list as it now stands, scrolled to the latest address. */
-    void reload();
+    QTableView& table() const { return *m_table; }
 
 private:
-    RecipientsModel* m_model;
     QTableView* m_table;
 };

@@ -6,7 +6,7 @@
 class QTextDocument;
 
 /**
- * One of the character sets of the "selectedCharacterSet" setting, and the message body's
+ * One of the character sets of the character-set setting, and the message body's
  * HTML in it: the HTML declares the set in its meta element, and every character the set
  * cannot hold is written as a numeric character reference ("&#8364;"), so that the bytes
  * encode the text without loss.

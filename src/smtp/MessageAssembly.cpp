@@ -70,7 +70,7 @@ QByteArray messageIdDomain(const QString& address) {
     return usable ? domain : QByteArrayLiteral("localhost");
 }
 
-// The charset parameter for each "selectedCharacterSet" index; other indexes name none.
+// The charset parameter for each character-set setting index; other indexes name none.
 const char* charsetParameter(int characterSetIndex) {
     switch (characterSetIndex) {
     case 0:

@@ -35,7 +35,7 @@ public:
 
     /**
      * Appends a base64 part of mimeType ("text/html", "text/plain") holding text in the
-     * character set of the "selectedCharacterSet" index: 0 utf-8, 1 us-ascii, 2 iso-8859-1,
+     * character set of the character-set setting's index: 0 utf-8, 1 us-ascii, 2 iso-8859-1,
      * 3 shift-jis, named in the charset parameter; any other index sets no parameter and the
      * text goes in UTF-8. Characters the set cannot hold become numeric character references
      * in text/html and "?" in any other type. Line ends become CRLF (RFC 2046 4.1.1).

@@ -1,90 +1,91 @@
 #pragma once
 
+#include "smtp/DeliveryRequest.h"
+
 #include <QObject>
 #include <QPointer>
 
-#include <memory>
-
-class MessageAssembly;
-class PelmoController;
-class PelmoException;
 class SmtpSession;
 
 /**
- * One delivery: one message to one recipient over one SMTP session. The controller creates a
- * fresh SMTP for every recipient and starts it with sendMail(); from then on the object builds
- * the message from the controller's getters, drives its session, reports every step through
- * the controller's status line, and hands control back to the controller (sendMember) when the
- * connection has closed.
+ * One delivery: one message to one recipient over one SMTP session (RFC 5321), driven from a
+ * DeliveryRequest. It builds the MIME message, connects, upgrades to TLS when asked, logs in
+ * when asked, sends, and closes; every step is reported as a status line.
  *
- * The object owns its session. It is a child of the controller and deletes itself once its
- * session has ended; it emits finished() once, when it reaches a state from which it starts no
- * further step on its own.
+ * The object owns its session. It ends in one of three ways, each reported once by finished():
+ * the connection closed or was lost (Ended: the run may hand over to the next recipient), it
+ * timed out or TLS failed (TimedOut), or a failure stopped it (Halted: the session is closed at
+ * once and whatever the server does later is ignored). A refused message (refused()) and an
+ * unknown login mechanism (stalled()) leave the connection open, and its end is reported as
+ * Ended like any other.
  */
 class SMTP : public QObject {
     Q_OBJECT
 
 public:
     enum class State {
-        Created,        ///< made, sendMail not yet called
-        Connecting,     ///< connecting in the background
-        Connected,      ///< transport up, waiting for the greeting and capabilities
-        Upgrading,      ///< STARTTLS under way
-        Authenticating, ///< credentials sent
-        Sending,        ///< message handed to the session
-        Closing,        ///< QUIT sent after success or a refused login
-        Stalled,        ///< an unknown login mechanism: nothing sent, connection left open
-        Aborted,        ///< the message was refused and the run stopped
-        Halted,         ///< a setting failed validation: no further step
-        Ended,          ///< the session has ended
+        Created,             ///< made, start() not yet called
+        Connecting,          ///< connecting in the background
+        Connected,           ///< transport up, waiting for the greeting and capabilities
+        Upgrading,           ///< STARTTLS under way
+        AwaitingCredentials, ///< the login asked for, not yet answered
+        Authenticating,      ///< credentials sent
+        Sending,             ///< message handed to the session
+        Closing,             ///< QUIT sent after success or a refused login
+        Stalled,             ///< an unknown login mechanism: nothing sent, connection open
+        Aborted,             ///< the message was refused; the connection is left open
+        Halted,              ///< a failure stopped the delivery; the session is closed
+        TimedOut,            ///< a time-out or a failed TLS handshake ended the session
+        Ended,               ///< the connection closed or was lost
     };
     Q_ENUM(State)
 
-    explicit SMTP(PelmoController& controller);
+    /** session is taken over (reparented to this object). */
+    SMTP(DeliveryRequest request, SmtpSession* session, QObject* parent = nullptr);
     ~SMTP() override;
 
-    /** Starts the delivery; returns once the connection attempt runs in the background. */
-    void sendMail();
-
-    /** Adds a body part with the chosen character set, base64-encoded. */
-    void createMessageBodyPart(const QString& content, const QString& mimeType);
+    /** Builds the message and starts connecting; returns at once. */
+    void start();
 
     State state() const { return m_state; }
+    /** True once the server accepted the message. */
     bool succeeded() const { return m_succeeded; }
+    const DeliveryRequest& request() const { return m_request; }
 
 Q_SIGNALS:
-    /** The delivery will start nothing more by itself; accepted when the server took the message.
-     */
-    void finished(bool accepted);
+    /** A line for the status line and the activity log. */
+    void statusMessage(const QString& text);
+    /** The server accepted the message for recipient, the address it was sent to. */
+    void accepted(const QString& recipient);
+    /** The server refused the message; its reply has been shown when readable. */
+    void refused();
+    /** The login mechanism is unknown: the list is shown and nothing more is sent. */
+    void stalled();
+    /** The delivery is over: state() is Ended, TimedOut or Halted. */
+    void finished();
 
 private:
+    void connectSession();
     void connectionEstablished();
     void serviceInitialized();
+    void askCredentials();
+    void authenticate(const Credentials& credentials);
     void authenticationCompleted();
     void authenticationFailed();
     void messageSent();
     void messageNotSent();
     void connectionTimedOut();
     void connectionTerminated();
-
-    void start();
-    void buildMessage();
-    void openSession();
-    void authenticate();
-    void releaseSession();
-    /** After the last delivery: the spinner stops, and a success applies the completion action. */
-    void finishRun();
     void reportFailureReason();
-    void enter(State state);
-    /** Runs step, reporting a settings failure the way the status line shows it. */
+    void halt(const PelmoException& failure);
+    void end(State state);
+    /** Runs step, halting on a failure. */
     template <class Step>
     void trapped(Step step);
-    void trap(const PelmoException& failure);
+    void status(const QString& text) { Q_EMIT statusMessage(text); }
 
-    PelmoController& m_controller;
-    std::unique_ptr<MessageAssembly> m_message;
+    DeliveryRequest m_request;
     QPointer<SmtpSession> m_session;
     State m_state = State::Created;
     bool m_succeeded = false;
-    bool m_finished = false;
 };

@@ -77,7 +77,7 @@ public:
 
     /**
      * An unconnected session to host:port. `timeout` caps every waiting limit above (the
-     * "smtpTimeout" setting); zero or less keeps the limits as they are.
+     * time-out setting); zero or less keeps the limits as they are.
      */
     SmtpClient(const QString& host, quint16 port,
                std::chrono::seconds timeout = std::chrono::seconds::zero(),

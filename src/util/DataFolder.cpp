@@ -1,5 +1,6 @@
 #include "util/DataFolder.h"
 
+#include "util/AppIdentity.h"
 #include "util/PrivateFiles.h"
 
 #include <QStandardPaths>
@@ -37,8 +38,8 @@ bool GetOurApplicationSupportFolder(std::filesystem::path& folder) {
     if (base.isEmpty())
         return false;
     const std::filesystem::path company =
-        std::filesystem::path(base.toStdString()) / "Orvale Software";
-    const std::filesystem::path ours = company / "Pelmo";
+        std::filesystem::path(base.toStdString()) / kOrganisationName;
+    const std::filesystem::path ours = company / kApplicationName;
     if (!MakePrivateFolder(company) || !MakePrivateFolder(ours))
         return false;
     tightenFilesIn(ours);

@@ -2,13 +2,17 @@
 
 #include "RecordingView.h"
 #include "addressbook/AddressBook.h"
+#include "controller/MailSettings.h"
 #include "controller/PasswordStore.h"
 #include "controller/PelmoController.h"
 
+#include <QEventLoop>
 #include <QSettings>
 #include <QTemporaryDir>
+#include <QTimer>
 #include <gtest/gtest.h>
 
+#include <functional>
 #include <memory>
 #include <ostream>
 
@@ -17,23 +21,28 @@ inline void PrintTo(const QString& text, std::ostream* out) {
     *out << '"' << text.toStdString() << '"';
 }
 
-// A keyring that answers what the test put in it and counts the questions; with answers
-// false it behaves as a machine without a keyring.
+// A keyring that answers later on the main loop, as a real one does, with what the test put in
+// it; with answers false it behaves as a machine without a keyring.
 class FakeKeyring : public PasswordStore {
 public:
     QString stored;
-    int reads = 0;
     bool answers = true;
-    QString readPassword(const QString&) override { return ++reads, answers ? stored : QString(); }
-    bool writePassword(const QString&, const QString& password) override {
-        if (answers)
-            stored = password;
-        return answers;
+    void readPassword(const QString&, QObject* context, ReadAnswer answer) override {
+        QTimer::singleShot(1, context, [this, answer] { answer(answers ? stored : QString()); });
     }
-    bool deletePassword(const QString&) override {
-        if (answers)
+    void writePassword(const QString&, const QString& password, QObject* context,
+                       WriteAnswer answer) override {
+        QTimer::singleShot(1, context, [this, password, answer] {
+            if (answers)
+                stored = password;
+            answer(answers);
+        });
+    }
+    void deletePassword(const QString&, QObject* context, WriteAnswer answer) override {
+        QTimer::singleShot(1, context, [this, answer] {
             stored.clear();
-        return answers;
+            answer(answers);
+        });
     }
     bool keyringAnswers() const override { return answers; }
 };
@@ -52,21 +61,43 @@ struct TestSettings {
         settings().clear();
         settings().sync();
     }
+    /** Runs the event loop until done() holds or a generous deadline passes; answers done(). */
+    static bool waitUntil(const std::function<bool()>& done, int ms = 5000) {
+        QEventLoop loop;
+        QTimer deadline;
+        deadline.setSingleShot(true);
+        deadline.start(ms);
+        while (!done() && deadline.isActive())
+            loop.processEvents(QEventLoop::WaitForMoreEvents, 20);
+        return done();
+    }
 };
 
 // A controller over a recording view, a fresh SQLite address book and empty settings.
-class ControllerFixture : public ::testing::Test, protected TestSettings {
-protected:
+class ControllerFixture : public ::testing::Test, public TestSettings {
+public:
     void SetUp() override {
         ASSERT_TRUE(folder.isValid());
         clearSettings();
         book = std::make_unique<AddressBook>(folder.filePath(QStringLiteral("book.sqlite")));
-        controller = std::make_unique<PelmoController>(view, *book, keyring);
+        controller = std::make_unique<PelmoController>(view, *book, keyring, mailSettings);
+    }
+
+    /** Presses Send and waits until the run has nothing under way. */
+    void runUntilSettled(int ms = 5000) {
+        bool settled = false;
+        const auto connection = QObject::connect(controller.get(), &PelmoController::runSettled,
+                                                 [&settled] { settled = true; });
+        controller->send();
+        waitUntil([&settled] { return settled; }, ms);
+        QObject::disconnect(connection);
+        ASSERT_TRUE(settled) << "the run never settled";
     }
 
     QTemporaryDir folder;
     RecordingView view;
     FakeKeyring keyring;
+    MailSettings mailSettings;
     std::unique_ptr<AddressBook> book;
     std::unique_ptr<PelmoController> controller;
 };

@@ -2,335 +2,285 @@
 #include "ScriptedSession.h"
 
 #include "addressbook/ImportedContact.h"
+#include "browser/PageDownload.h"
+#include "controller/MessageTemplate.h"
+#include "controller/SentRecipients.h"
+#include "util/CLog.h"
 
-#include <QCoreApplication>
-#include <QEventLoop>
+#include <QFile>
+#include <QMetaEnum>
+#include <QProcess>
+#include <QRegularExpression>
+#include <QStandardPaths>
 #include <QTextDocument>
-#include <QTimer>
 
 namespace {
 
-// A run over scripted sessions: every session a delivery opens is recorded, and the test waits
-// until the controller reports that nothing is in progress any more.
-class MailingRun : public ControllerFixture {
-protected:
+// tests/data/pages served on 127.0.0.1 (page_server.py); it stops with the test, or by itself.
+class PageServer {
+public:
+    PageServer() {
+        server.start(QStringLiteral(PELMO_PYTHON3),
+                     {QStringLiteral("-u"),
+                      QStringLiteral(PELMO_TEST_DIR "/controller/page_server.py"),
+                      QStringLiteral(PELMO_TEST_DATA "/pages")});
+        static const QRegularExpression serving(QStringLiteral(R"(port (\d+))"));
+        QByteArray said;
+        while (port == 0 && server.waitForReadyRead(5000)) {
+            said += server.readAllStandardOutput();
+            port = serving.match(QString::fromLatin1(said)).captured(1).toInt();
+        }
+    }
+    ~PageServer() {
+        server.closeWriteChannel(); // the server stops when its input closes
+        if (!server.waitForFinished(3000))
+            server.kill();
+        server.waitForFinished();
+    }
+    QString url(const QString& path) const {
+        return QStringLiteral("http://127.0.0.1:%1/%2").arg(port).arg(path);
+    }
+
+    QProcess server;
+    int port = 0;
+};
+
+// Whole runs over scripted sessions. A scenario is what the user and the server do, step by
+// step; the transcript of everything the controller shows, every session call and every
+// address recorded as sent must match tests/data/runs/<name>.txt line by line.
+class Run : public ControllerFixture {
+public:
     void SetUp() override {
         ControllerFixture::SetUp();
-        set("senderEmail", QStringLiteral("me@example.org"));
-        set("senderName", QStringLiteral("Me"));
-        set("serverAddress", QStringLiteral("mail.example.org"));
-        set("serverPort", 25);
-        set("loginUsername", QStringLiteral("me"));
-        set("loginPassword", QStringLiteral("secret"));
-        set("selectedContentType", 1);
+        for (const auto& [key, value] :
+             {std::pair<const char*, QVariant>{"senderEmail", "me@example.org"},
+              {"senderName", "Me"},
+              {"serverAddress", "mail.example.org"},
+              {"serverPort", 25},
+              {"loginUsername", "me"},
+              {"loginPassword", "secret"},
+              {"selectedContentType", 1}})
+            set(key, value);
         controller->message()->setPlainText(QStringLiteral("Hello {toName}"));
         controller->setSessionFactory([this](const QString& host, int port) -> SmtpSession* {
-            calls << QStringLiteral("open %1:%2").arg(host).arg(port);
-            return new ScriptedSession(script, calls);
+            note(QStringLiteral("smtp: open %1:%2").arg(host).arg(port));
+            return new ScriptedSession(script, view.transcript);
         });
-        QObject::connect(controller.get(), &PelmoController::runIdle, [this] { idle = true; });
+        QObject::connect(&controller->sentRecipients(), &SentRecipients::rowsInserted, [this] {
+            note("sent: " + controller->sentRecipients().addresses().last());
+        });
+        view.toText = QStringLiteral("ann@example.org");
+        view.nameText = QStringLiteral("Ann");
     }
-
-    void runUntilIdle() {
-        idle = false;
+    void note(const QString& line) { view.transcript << line; }
+    void press() {
+        note("user: presses " + view.buttonTitle);
         controller->send();
-        QEventLoop loop;
-        QTimer deadline;
-        QObject::connect(&deadline, &QTimer::timeout, &loop, &QEventLoop::quit);
-        deadline.start(5000);
-        while (!idle && deadline.isActive())
-            loop.processEvents(QEventLoop::WaitForMoreEvents, 50);
-        // Let deleteLater and queued signals settle before the test looks.
-        QCoreApplication::processEvents();
-        ASSERT_TRUE(idle) << "the run never became idle";
-    }
-
-    void selectGroupOf(const QList<QPair<QString, QString>>& people) {
-        QList<ImportedContact> contacts;
-        for (const auto& [name, address] : people) {
-            ImportedContact contact;
-            contact.person.firstName = name;
-            contact.person.lastName = QStringLiteral("Test");
-            if (!address.isEmpty())
-                contact.person.emails << address;
-            contact.person.primary = address.isEmpty() ? -1 : 0;
-            contact.groups << QStringLiteral("Club");
-            contacts << contact;
-        }
-        book->add(contacts);
-        controller->abGroupSelected({book->groupNamed(QStringLiteral("Club"))->id}, true);
-    }
-
-    QStringList linesAfter(const QString& first) const {
-        const qsizetype at = view.statuses.indexOf(first);
-        return at < 0 ? QStringList() : view.statuses.mid(at);
-    }
-
-    static QString dateless(QString line) {
-        // "[Mailing started at <date>]" and "[<date>] Mail to: ..." without their dates.
-        if (line.startsWith(QLatin1String("[Mailing")))
-            return line.left(line.indexOf(QLatin1String(" at ")) + 4) + QLatin1String("...]");
-        if (line.startsWith(QLatin1Char('[')))
-            return QLatin1String("[...]") + line.mid(line.indexOf(QLatin1Char(']')) + 1);
-        return line;
-    }
-
-    QStringList datelessStatuses() const {
-        QStringList out;
-        for (const QString& line : view.statuses)
-            out << dateless(line);
-        return out;
     }
 
     ScriptedSession::Script script;
-    QStringList calls;
-    bool idle = false;
+    std::unique_ptr<PageServer> pages;
 };
 
-TEST_F(MailingRun, OneMessageToTheToFieldSpinsAndCompletes) {
-    view.toText = QStringLiteral("ann@example.org");
-    view.nameText = QStringLiteral("Ann");
-    runUntilIdle();
-    EXPECT_EQ(
-        datelessStatuses().mid(datelessStatuses().indexOf(QStringLiteral("Sending mail."))),
-        (QStringList{QStringLiteral("Sending mail."), QStringLiteral("[Mailing started at ...]"),
-                     QStringLiteral("[...] Mail to: Ann <ann@example.org>"),
-                     QStringLiteral("Connecting to the mail.example.org server."),
-                     QStringLiteral("Connected to the mail.example.org server."),
-                     QStringLiteral("Sending the message."),
-                     QStringLiteral("Message sent. Closing the connection."),
-                     QStringLiteral("Connection closed. Done."),
-                     QStringLiteral("[Mailing completed at ...]")}));
-    EXPECT_TRUE(view.busy);
-    EXPECT_FALSE(view.animating);
-    EXPECT_EQ(view.buttonTitle, QStringLiteral("Send"));
-    EXPECT_TRUE(controller->recipientsContains(QStringLiteral("ANN@example.org")));
-    EXPECT_EQ(calls,
-              (QStringList{QStringLiteral("open mail.example.org:25"),
-                           QStringLiteral("message to ann@example.org"), QStringLiteral("connect"),
-                           QStringLiteral("send"), QStringLiteral("close")}));
-    EXPECT_FALSE(controller->getPeople().has_value());
+using Step = std::function<void(Run&)>;
+
+Step setting(const char* key, const QVariant& value) {
+    return [=](Run&) { TestSettings::set(key, value); };
 }
-
-TEST_F(MailingRun, AGroupOfThreeCountsOneTwoThreeAndIsNotMailedTwice) {
-    selectGroupOf({{QStringLiteral("Ann"), QStringLiteral("ann@example.org")},
-                   {QStringLiteral("Bob"), QStringLiteral("bob@example.org")},
-                   {QStringLiteral("Cy"), QStringLiteral("cy@example.org")}});
-    runUntilIdle();
-    EXPECT_EQ(view.maximum, 3.0);
-    EXPECT_EQ(view.values, (QList<double>{1.0, 2.0, 3.0}));
-    EXPECT_EQ(controller->numberOfRows(), 3);
-    EXPECT_EQ(view.statuses.last().left(21), QStringLiteral("[Mailing completed at"));
-    EXPECT_EQ(calls.filter(QStringLiteral("message to")).size(), 3);
-
-    // The same group again: everyone is skipped and the run ends without a connection.
-    calls.clear();
-    view.statuses.clear();
-    controller->abGroupSelected({book->groupNamed(QStringLiteral("Club"))->id}, true);
-    EXPECT_EQ(view.statuses.filter(QStringLiteral("Skipping")),
-              (QStringList{QStringLiteral("Skipping ann@example.org"),
-                           QStringLiteral("Skipping bob@example.org"),
-                           QStringLiteral("Skipping cy@example.org")}));
-    runUntilIdle();
-    EXPECT_TRUE(calls.isEmpty());
-    EXPECT_EQ(view.statuses.last().left(21), QStringLiteral("[Mailing completed at"));
+Step scripted(std::function<void(ScriptedSession::Script&, Run&)> change) {
+    return [=](Run& run) { change(run.script, run); };
 }
-
-TEST_F(MailingRun, APersonWithoutAnAddressHaltsTheRunWithStopShowing) {
-    selectGroupOf({{QStringLiteral("Ann"), QStringLiteral("ann@example.org")},
-                   {QStringLiteral("Nobody"), QString()},
-                   {QStringLiteral("Cy"), QStringLiteral("cy@example.org")}});
-    runUntilIdle();
-    EXPECT_EQ(view.buttonTitle, QStringLiteral("Stop"));
-    EXPECT_EQ(calls.filter(QStringLiteral("message to")),
-              QStringList{QStringLiteral("message to ann@example.org")});
-    ASSERT_TRUE(controller->getPeople().has_value());
-    EXPECT_EQ(controller->getPeople()->size(), 1); // Cy is still to be mailed
-    EXPECT_EQ(view.nameText, QStringLiteral("Nobody Test"));
-}
-
-TEST_F(MailingRun, StopLetsTheCurrentCopyFinishAndSendResumes) {
-    selectGroupOf({{QStringLiteral("Ann"), QStringLiteral("ann@example.org")},
-                   {QStringLiteral("Bob"), QStringLiteral("bob@example.org")}});
-    // Press Stop as soon as the first copy is handed to its session.
-    QObject::connect(controller.get(), &PelmoController::recipientsChanged, [this] {
-        if (controller->numberOfRows() == 1)
-            controller->send();
-    });
-    runUntilIdle();
-    EXPECT_EQ(controller->numberOfRows(), 1);
-    EXPECT_EQ(view.buttonTitle, QStringLiteral("Send"));
-    ASSERT_TRUE(controller->getPeople().has_value());
-    EXPECT_EQ(controller->getPeople()->size(), 1);
-
-    runUntilIdle(); // Send again, no new selection: Bob is next
-    EXPECT_EQ(controller->numberOfRows(), 2);
-    EXPECT_EQ(controller->valueFor(QStringLiteral("email"), 1).toString(),
-              QStringLiteral("bob@example.org"));
-}
-
-TEST_F(MailingRun, LoginMechanismsAndTls) {
-    struct Row {
-        const char* name;
-        int mechanism;
-        bool ssl;
-        bool implicitTls;
-        QStringList expectedCalls;
-        const char* expectedLine;
+// The group "Club" of these addresses ("" for a person without one), chosen in the picker.
+Step group(const QStringList& addresses) {
+    return [=](Run& run) {
+        QList<ImportedContact> contacts;
+        for (const QString& address : addresses)
+            contacts << ImportedContact{
+                Person{0, address.section(QLatin1Char('@'), 0, 0), QStringLiteral("Test"),
+                       address.isEmpty() ? QStringList() : QStringList{address},
+                       address.isEmpty() ? -1 : 0},
+                {QStringLiteral("Club")}};
+        run.book->add(contacts);
     };
-    const Row rows[] = {
-        {"no login", 0, false, false, {"connect", "send", "close"}, "Sending the message."},
-        {"plain",
-         1,
-         false,
-         false,
-         {"connect", "auth PLAIN me", "send", "close"},
-         "Authentication completed. Sending the message."},
-        {"cram-md5",
-         3,
-         false,
-         false,
-         {"connect", "auth CRAM-MD5 me", "send", "close"},
-         "Available authentication mechanisms: (PLAIN, LOGIN)"},
-        {"starttls once",
-         2,
-         true,
-         false,
-         {"connect", "startTLS", "auth LOGIN me", "send", "close"},
-         "SSL handshaking..."},
-        {"implicit tls", 0, true, true, {"connect", "startSSL", "send", "close"}, "Starting SSL."},
+}
+const Step choose = [](Run& run) {
+    run.note(QStringLiteral("user: chooses Club"));
+    run.controller->abGroupSelected({run.book->groupNamed(QStringLiteral("Club"))->id}, true);
+};
+// Presses Send (or Stop) and waits until the run has nothing under way.
+const Step send = [](Run& run) {
+    run.note("user: presses " + run.view.buttonTitle);
+    run.runUntilSettled();
+    run.note(QStringLiteral("settled: ") + QMetaEnum::fromType<MailingRun::State>().valueToKey(
+                                               int(run.controller->currentRun()->state())));
+};
+const Step press = [](Run& run) { run.press(); };
+// Types address into the Web Page field, "PORT" standing for the page server's.
+Step page(const QString& address) {
+    return [=](Run& run) {
+        if (!run.pages)
+            run.pages = std::make_unique<PageServer>();
+        run.view.pageText =
+            QString(address).replace(QLatin1String("PORT"), QString::number(run.pages->port));
     };
-    for (const Row& row : rows) {
-        calls.clear();
-        view.statuses.clear();
-        script.implicitTls = row.implicitTls;
-        set("selectedAuthentication", row.mechanism);
-        set("useSSL", row.ssl);
-        view.toText = QStringLiteral("ann@example.org");
-        view.nameText = QStringLiteral("Ann");
-        runUntilIdle();
-        EXPECT_EQ(calls.mid(2), row.expectedCalls) << row.name;
-        EXPECT_TRUE(view.statuses.contains(QLatin1String(row.expectedLine))) << row.name;
-        EXPECT_EQ(view.statuses.count(QStringLiteral("SSL handshaking...")),
-                  row.ssl && !row.implicitTls ? 1 : 0)
-            << row.name;
-    }
+}
+// The page as the current copy has it.
+const Step showPage = [](Run& run) {
+    const QString page = run.controller->messageTemplate().getWebPageOrFileContents();
+    run.note("page: " + (page.isNull() ? QStringLiteral("(none)") : page));
+};
+const Step pause = [](Run& run) {
+    TestSettings::waitUntil([] { return false; }, 300);
+    run.note(QStringLiteral("user: waits"));
+};
+
+struct Scenario {
+    const char* name;
+    QList<Step> steps;
+};
+
+const QStringList kClub = {"ann@example.org", "bob@example.org"};
+
+const Scenario kScenarios[] = {
+    // One copy to the To field: the bar spins, every step is shown, the address is recorded.
+    {"single", {send}},
+    // A group counts 1, 2, 3 of 3; chosen again, everyone is skipped and nobody is mailed.
+    {"group_twice", {group(kClub + QStringList{"cy@example.org"}), choose, send, choose, send}},
+    // A person without an address stalls the run with Stop showing; the rest stay pending.
+    {"no_address", {group({"ann@example.org", "", "cy@example.org"}), choose, send}},
+    // Stop lets the copy on its way finish and runs no completion action; Send goes on.
+    {"stop_and_resume",
+     {setting("completionAction", 2), group(kClub), choose,
+      scripted([](auto& script, Run& run) { script.onSend = [&run] { run.press(); }; }), send,
+      scripted([](auto& script, Run&) { script.onSend = nullptr; }), send}},
+    {"login_plain", {setting("selectedAuthentication", 1), send}},
+    {"login_cram_md5", {setting("selectedAuthentication", 3), send}},
+    // TLS wanted on a plain port: STARTTLS once, then the login.
+    {"starttls", {setting("selectedAuthentication", 2), setting("useSSL", true), send}},
+    {"implicit_tls",
+     {setting("useSSL", true), scripted([](auto& script, Run&) { script.implicitTls = true; }),
+      send}},
+    // The keyring's password (answering later) before the settings file's; none halts.
+    {"password_sources",
+     {setting("selectedAuthentication", 1), [](Run& run) { run.keyring.stored = "from-keyring"; },
+      send, [](Run& run) { run.keyring.stored.clear(); }, send, setting("loginPassword", ""),
+      send}},
+    // An unknown mechanism shows the list and waits with the connection open.
+    {"unknown_mechanism", {setting("selectedAuthentication", 4), send}},
+    // A refused login closes, moves on, and no completion action follows.
+    {"login_refused",
+     {setting("selectedAuthentication", 2), setting("completionAction", 2),
+      scripted([](auto& script, Run&) { script.acceptLogin = false; }), group(kClub), choose,
+      send}},
+    {"reset_after_success", {setting("completionAction", 2), send}},
+    // A refused message beeps, shows the reply when it is UTF-8, and stops the run.
+    {"refused",
+     {scripted([](auto& script, Run&) { script.refusal = "550 5.1.1 <ann@example.org>: no\r\n"; }),
+      group(kClub), choose, send,
+      scripted([](auto& script, Run&) { script.refusal = "550 \xff\xfe\r\n"; }), send}},
+    // A time-out stalls the run; a lost connection hands over to the next person.
+    {"timeout_then_lost",
+     {scripted([](auto& script, Run&) { script.timeOutOnConnect = true; }), group(kClub), choose,
+      send, press, scripted([](auto& script, Run&) {
+          script = {};
+          script.loseConnectionOnSend = true;
+      }),
+      choose, send}},
+    // A failing setting halts: Send again, nothing more starts, not even when the server drops
+    // the connection later, which is closed at once.
+    {"halt_no_server", {setting("serverAddress", ""), group(kClub), choose, send}},
+    {"halt_no_username",
+     {setting("selectedAuthentication", 1), setting("loginUsername", ""),
+      scripted([](auto& script, Run&) { script.dropWhenIdle = true; }), group(kClub), choose, send,
+      pause}},
+    // The page is fetched lower-cased and its links made absolute against the address as
+    // typed; every copy gets its own tags in it.
+    {"page",
+     {page("HTTP://127.0.0.1:PORT/Dir/Page.HTML"), send, showPage,
+      [](Run& run) { run.view.nameText = "Bob"; }, showPage}},
+    // A page that cannot be had is said so and the copy goes without it; what is no web
+    // address fetches nothing.
+    {"page_missing",
+     {page("http://127.0.0.1:PORT/dir/missing.html"), send, showPage, page("/home/me/page.html"),
+      send, page("ftp://host/x"), send}},
+    // Stop while the page downloads ends the run at once: nothing is mailed, not even later.
+    {"page_stopped", {page("http://127.0.0.1:PORT/dir/page.html"), press, press, pause}},
+    // The address recorded is the one the copy went to, whatever To says by then.
+    {"to_edited_while_sending",
+     {scripted([](auto& script, Run& run) {
+          script.onSend = [&run] { run.view.toText = QStringLiteral("typed@example.org"); };
+      }),
+      send}},
+};
+
+void PrintTo(const Scenario& scenario, std::ostream* out) {
+    *out << scenario.name;
 }
 
-TEST_F(MailingRun, AnUnknownMechanismShowsTheListAndStops) {
-    set("selectedAuthentication", 4);
-    view.toText = QStringLiteral("ann@example.org");
-    view.nameText = QStringLiteral("Ann");
-    runUntilIdle();
-    EXPECT_EQ(view.statuses.last(),
-              QStringLiteral("Available authentication mechanisms: (PLAIN, LOGIN)"));
-    EXPECT_FALSE(calls.contains(QStringLiteral("send")));
-    EXPECT_FALSE(calls.contains(QStringLiteral("close"))); // the connection is left open
+class RunScenario : public Run, public ::testing::WithParamInterface<Scenario> {};
+
+TEST_P(RunScenario, Transcript) {
+    for (const Step& step : GetParam().steps)
+        step(*this);
+    QString actual = view.transcript.join(QLatin1Char('\n')) + QLatin1Char('\n');
+    if (pages)
+        actual.replace(QStringLiteral("127.0.0.1:%1").arg(pages->port),
+                       QLatin1String("127.0.0.1:PORT"));
+    QFile file(QStringLiteral(PELMO_TEST_DATA "/runs/%1.txt").arg(GetParam().name));
+    // Writes the transcripts anew, to be read through before they are committed.
+    if (qEnvironmentVariableIsSet("PELMO_WRITE_TRANSCRIPTS") && file.open(QIODevice::WriteOnly))
+        file.write(actual.toUtf8());
+    file.close();
+    ASSERT_TRUE(file.open(QIODevice::ReadOnly)) << file.fileName().toStdString();
+    EXPECT_EQ(actual, QString::fromUtf8(file.readAll()));
 }
 
-TEST_F(MailingRun, ARefusedLoginMovesOnAndSkipsTheCompletionAction) {
-    set("selectedAuthentication", 2);
-    set("completionAction", 2);
-    script.acceptLogin = false;
-    selectGroupOf({{QStringLiteral("Ann"), QStringLiteral("ann@example.org")},
-                   {QStringLiteral("Bob"), QStringLiteral("bob@example.org")}});
-    view.subjectText = QStringLiteral("Kept");
-    runUntilIdle();
-    EXPECT_EQ(view.statuses.count(QStringLiteral("Authentication failed. Closing the connection.")),
-              2);
-    EXPECT_EQ(controller->numberOfRows(), 0);
-    EXPECT_EQ(view.statuses.last().left(21), QStringLiteral("[Mailing completed at"));
-    EXPECT_EQ(view.subjectText, QStringLiteral("Kept")); // no reset after a failed last copy
+INSTANTIATE_TEST_SUITE_P(Runs, RunScenario, ::testing::ValuesIn(kScenarios),
+                         [](const auto& row) { return std::string(row.param.name); });
+
+// The password reaches the server, never the status line or the log.
+TEST_F(Run, PasswordIsNeitherShownNorLogged) {
+    set("selectedAuthentication", 1);
+    keyring.stored = QStringLiteral("k3yring-pw");
+    StartLogging();
+    runUntilSettled();
+    StopLogging();
+    QFile log(QStandardPaths::writableLocation(QStandardPaths::GenericDataLocation) +
+              QStringLiteral("/Orvale Software/Pelmo/Pelmo.log"));
+    ASSERT_TRUE(log.open(QIODevice::ReadOnly));
+    EXPECT_TRUE(view.transcript.contains(QStringLiteral("smtp: auth PLAIN me:k3yring-pw")));
+    EXPECT_FALSE(log.readAll().contains("k3yring"));
+    EXPECT_FALSE(view.statuses.join(QLatin1Char('\n')).contains(QStringLiteral("k3yring")));
 }
 
-TEST_F(MailingRun, ASuccessfulLastCopyResetsTheFormWhenAsked) {
-    set("completionAction", 2);
-    view.toText = QStringLiteral("ann@example.org");
-    view.nameText = QStringLiteral("Ann");
-    view.subjectText = QStringLiteral("Gone after the run");
-    runUntilIdle();
-    EXPECT_EQ(view.subjectText, QString());
-    EXPECT_EQ(view.statuses.last(), QStringLiteral("Ready."));
-    EXPECT_TRUE(controller->message()->isEmpty());
-}
-
-TEST_F(MailingRun, ARefusedMessageBeepsShowsTheReplyAndStopsTheRun) {
-    struct Row {
-        const char* name;
-        QByteArray reply;
-        bool lineShown;
+// Pages are decoded as UTF-8, else in the charset declared, else as Mac OS Roman; redirects are
+// followed; a failure says why.
+TEST(PageDownload, Decoding) {
+    auto pages = std::make_unique<PageServer>();
+    const auto download = [](const QString& url, QString* error = nullptr) {
+        PageDownload page;
+        QString text = QStringLiteral("none");
+        QObject::connect(&page, &PageDownload::finished,
+                         [&](const QString& got, const QString& why) {
+                             text = got;
+                             if (error)
+                                 *error = why;
+                         });
+        page.start(url);
+        TestSettings::waitUntil([&] { return page.state() == PageDownload::State::Finished; });
+        return text;
     };
-    const Row rows[] = {{"utf-8 reply", "550 5.1.1 <ann@example.org>: unknown user\r\n", true},
-                        {"reply not utf-8", "550 \xff\xfe\r\n", false}};
-    for (const Row& row : rows) {
-        controller->resetRecipients();
-        view.statuses.clear();
-        view.events.clear();
-        script.refusal = row.reply;
-        selectGroupOf({{QStringLiteral("Ann"), QStringLiteral("ann@example.org")},
-                       {QStringLiteral("Bob"), QStringLiteral("bob@example.org")}});
-        runUntilIdle();
-        EXPECT_TRUE(view.events.contains(QStringLiteral("beep"))) << row.name;
-        EXPECT_EQ(view.statuses.contains(QStringLiteral(
-                      "Message not sent: 550 5.1.1 <ann@example.org>: unknown user")),
-                  row.lineShown)
-            << row.name;
-        EXPECT_EQ(view.buttonTitle, QStringLiteral("Send")) << row.name;
-        ASSERT_TRUE(controller->getPeople().has_value()) << row.name;
-        EXPECT_GE(controller->getPeople()->size(), 1) << row.name; // Bob waits for the next Send
-        EXPECT_EQ(controller->numberOfRows(), 0) << row.name;
-    }
-}
-
-TEST_F(MailingRun, ATimeOutHaltsAndALostConnectionMovesOn) {
-    script.timeOutOnConnect = true;
-    selectGroupOf({{QStringLiteral("Ann"), QStringLiteral("ann@example.org")},
-                   {QStringLiteral("Bob"), QStringLiteral("bob@example.org")}});
-    runUntilIdle();
-    EXPECT_EQ(view.statuses.last(), QStringLiteral("Connection lost."));
-    EXPECT_EQ(calls.filter(QStringLiteral("open")).size(), 1); // Bob is not started
-    EXPECT_EQ(view.buttonTitle, QStringLiteral("Stop"));
-
-    calls.clear();
-    view.statuses.clear();
-    script = {};
-    script.loseConnectionOnSend = true;
-    controller->abGroupSelected({book->groupNamed(QStringLiteral("Club"))->id}, true);
-    view.buttonTitle = QStringLiteral("Send");
-    runUntilIdle();
-    EXPECT_EQ(calls.filter(QStringLiteral("open")).size(), 2); // the lost connection hands over
-    EXPECT_EQ(view.statuses.count(QStringLiteral("The remote host closed the connection")), 2);
-    EXPECT_EQ(controller->numberOfRows(), 0);
-}
-
-TEST_F(MailingRun, ASettingThatFailsHaltsWithItsNameAndReason) {
-    struct Row {
-        const char* name;
-        const char* key;
-        int mechanism;
-        const char* line;
-    };
-    const Row rows[] = {
-        {"no server", "serverAddress", 0,
-         "Error (NoServer): The outgoing SMTP server 'Address:' preference value has not been "
-         "specified."},
-        {"no user name, while logging in", "loginUsername", 1,
-         "Error (NoUsername): The outgoing SMTP server 'Username:' preference value has not been "
-         "specified."},
-    };
-    for (const Row& row : rows) {
-        view.statuses.clear();
-        settings().remove(QLatin1String(row.key));
-        settings().sync();
-        set("selectedAuthentication", row.mechanism);
-        view.toText = QStringLiteral("ann@example.org");
-        view.nameText = QStringLiteral("Ann");
-        runUntilIdle();
-        EXPECT_EQ(view.statuses.last(), QLatin1String(row.line)) << row.name;
-        EXPECT_EQ(view.buttonTitle, QStringLiteral("Send")) << row.name;
-        EXPECT_FALSE(view.animating) << row.name;
-        set(row.key, QStringLiteral("restored"));
-    }
+    EXPECT_EQ(download(pages->url("dir/latin.html")),
+              QString::fromUtf8("<meta charset=\"iso-8859-1\"><p>caf\u00e9</p>"));
+    EXPECT_EQ(download(pages->url("dir/roman.html")), QString::fromUtf8("<p>caf\u00e9</p>"));
+    EXPECT_EQ(download(pages->url("dir")), QStringLiteral("<p>index</p>")); // to dir/
+    const QString gone = pages->url("dir/page.html");
+    pages.reset();
+    QString why;
+    EXPECT_TRUE(download(gone, &why).isNull());
+    EXPECT_FALSE(why.isEmpty());
+    EXPECT_TRUE(download(QStringLiteral("not a url"), &why).isNull());
+    EXPECT_EQ(why, QStringLiteral("not a valid address"));
 }
 
 } // namespace

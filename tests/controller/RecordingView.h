@@ -4,41 +4,57 @@
 
 #include <QStringList>
 
-// A view that keeps what the controller shows and counts how often each field is read.
+// A view that keeps what the controller shows, counts how often each field is read, and writes
+// every change the controller makes to it into one transcript, in order.
 class RecordingView : public PelmoView {
 public:
     QString subjectText, toText, nameText, pageText, buttonTitle = QStringLiteral("Send");
     QStringList statuses;
     QStringList events; // beeps and alerts in order
+    QStringList transcript;
     mutable int subjectReads = 0, toReads = 0, nameReads = 0;
-    int reloads = 0;
-    double minimum = 0, maximum = 0, value = 0;
-    QList<double> values; // every progress value set, in order
-    bool busy = false, animating = false;
+    double maximum = 0;
 
     QString subject() const override { return ++subjectReads, subjectText; }
-    void setSubject(const QString& text) override { subjectText = text; }
+    void setSubject(const QString& text) override { note("subject", subjectText = text); }
     QString to() const override { return ++toReads, toText; }
-    void setTo(const QString& text) override { toText = text; }
+    void setTo(const QString& text) override { note("to", toText = text); }
     QString name() const override { return ++nameReads, nameText; }
-    void setName(const QString& text) override { nameText = text; }
+    void setName(const QString& text) override { note("name", nameText = text); }
     QString webPageOrFile() const override { return pageText; }
-    void setWebPageOrFile(const QString& text) override { pageText = text; }
-    void setStatus(const QString& text) override { statuses << text; }
+    void setWebPageOrFile(const QString& text) override { note("page", pageText = text); }
+    void setStatus(const QString& text) override { note("status", dateless(text)), statuses << text; }
     void setProgressCounting(double min, double max, double val) override {
-        busy = false, minimum = min, maximum = max, value = val;
+        maximum = max;
+        note("bar", QStringLiteral("%1..%2 at %3").arg(min).arg(max).arg(val));
     }
-    void setProgressBusy() override { busy = true; }
-    void setProgressValue(double val) override { values << (value = val); }
+    void setProgressBusy() override { note("bar", QStringLiteral("busy")); }
+    void setProgressValue(double val) override { note("bar", QStringLiteral("at %1").arg(val)); }
     double progressMaximum() const override { return maximum; }
-    void startProgressAnimation() override { animating = true; }
-    void stopProgressAnimation() override { animating = false; }
+    void startProgressAnimation() override { note("bar", QStringLiteral("spins")); }
+    void stopProgressAnimation() override { note("bar", QStringLiteral("still")); }
     QString sendButtonTitle() const override { return buttonTitle; }
-    void setSendButtonTitle(const QString& title) override { buttonTitle = title; }
-    void showRecipientsWindow() override { events << QStringLiteral("recipients window"); }
-    void reloadRecipients() override { ++reloads; }
+    void setSendButtonTitle(const QString& title) override { note("button", buttonTitle = title); }
+    void showRecipientsWindow() override { note("window", QStringLiteral("sent recipients")); }
     void alert(const QString& title, const QString& text) override {
         events << QStringLiteral("alert: %1 / %2").arg(title, text);
+        note("alert", events.last());
     }
-    void beep() override { events << QStringLiteral("beep"); }
+    void beep() override {
+        events << QStringLiteral("beep");
+        transcript << events.last();
+    }
+
+    void note(const char* what, const QString& text) {
+        transcript << QLatin1String(what) + QLatin1String(": ") + text;
+    }
+
+    // "[Mailing started at <date>]" and "[<date>] Mail to: ..." with their dates left out.
+    static QString dateless(const QString& line) {
+        if (line.startsWith(QLatin1String("[Mailing")))
+            return line.left(line.indexOf(QLatin1String(" at ")) + 4) + QLatin1String("...]");
+        if (line.startsWith(QLatin1Char('[')))
+            return QLatin1String("[...]") + line.mid(line.indexOf(QLatin1Char(']')) + 1);
+        return line;
+    }
 };

@@ -3,56 +3,68 @@
 #include "smtp/SmtpSession.h"
 
 #include <QMetaObject>
+#include <QTimer>
+
+#include <functional>
 
 // A session that plays the server's part from a script, for the turns a real server is hard to
-// bring to: a refused reply that is not UTF-8, a time-out, a connection lost while sending.
-// Like a real session it answers on the main loop, never from inside the call.
+// bring to: a refused reply that is not UTF-8, a time-out, a connection lost while sending, a
+// server that drops an idle connection. Like a real session it answers on the main loop, never
+// from inside the call. Every call is written to the transcript it is given.
 class ScriptedSession : public SmtpSession {
 public:
     struct Script {
-        bool implicitTls = false; // transport is TLS from the start (port 465)
+        bool implicitTls = false; // the transport is TLS from the start (port 465)
         bool acceptLogin = true;
         bool timeOutOnConnect = false;
         bool loseConnectionOnSend = false;
-        QByteArray refusal; // non-empty: the message is refused with this reply
-        QStringList mechanisms = {QStringLiteral("PLAIN"), QStringLiteral("LOGIN")};
+        bool dropWhenIdle = false; // the server drops a connection nobody talks on
+        QByteArray refusal;        // non-empty: the message is refused with this reply
+        std::function<void()> onSend; // runs when the message goes
     };
 
-    ScriptedSession(const Script& script, QStringList& calls) : m_script(script), m_calls(calls) {
-        m_tls = script.implicitTls;
-    }
+    ScriptedSession(const Script& script, QStringList& transcript)
+        : m_script(script), m_transcript(transcript), m_tls(script.implicitTls) {}
 
     void connectInBackgroundAndNotify() override {
-        m_calls << QStringLiteral("connect");
+        note(QStringLiteral("connect"));
         if (m_script.timeOutOnConnect)
             return later(&SmtpSession::connectionTimedOut);
         later(&SmtpSession::connectionEstablished);
         if (!m_script.implicitTls)
             later(&SmtpSession::serviceInitialized);
+        if (m_script.dropWhenIdle)
+            QTimer::singleShot(100, this, [this] {
+                if (!m_closed)
+                    Q_EMIT connectionLost();
+            });
     }
     bool isSSL() const override { return m_tls; }
     void startSSL() override {
-        m_calls << QStringLiteral("startSSL");
+        note(QStringLiteral("startSSL"));
         later(&SmtpSession::serviceInitialized);
     }
     void startTLS() override {
-        m_calls << QStringLiteral("startTLS");
+        note(QStringLiteral("startTLS"));
         m_tls = true;
         later(&SmtpSession::serviceInitialized);
     }
-    QStringList supportedMechanisms() const override { return m_script.mechanisms; }
-    void authenticate(const QString& user, const QString&, const QString& mechanism) override {
-        m_calls << QStringLiteral("auth %1 %2").arg(mechanism, user);
+    QStringList supportedMechanisms() const override { return {"PLAIN", "LOGIN"}; }
+    void authenticate(const QString& user, const QString& password,
+                      const QString& mechanism) override {
+        note(QStringLiteral("auth %1 %2:%3").arg(mechanism, user, password));
         later(m_script.acceptLogin ? &SmtpSession::authenticationCompleted
                                    : &SmtpSession::authenticationFailed);
     }
-    void setMessage(const QByteArray& message, const QString&,
+    void setMessage(const QByteArray& message, const QString& sender,
                     const QStringList& recipients) override {
-        m_calls << QStringLiteral("message to %1").arg(recipients.join(QLatin1Char(',')));
+        note(QStringLiteral("message from %1 to %2").arg(sender, recipients.join(QLatin1Char(','))));
         m_message = message;
     }
     void sendMessage() override {
-        m_calls << QStringLiteral("send");
+        note(QStringLiteral("send"));
+        if (m_script.onSend)
+            m_script.onSend();
         if (m_script.loseConnectionOnSend)
             return later(&SmtpSession::connectionLost);
         m_last = m_script.refusal.isEmpty() ? QByteArray("250 OK") : m_script.refusal;
@@ -60,26 +72,28 @@ public:
                                          : &SmtpSession::messageNotSent);
     }
     void close() override {
-        m_calls << QStringLiteral("close");
+        note(QStringLiteral("close"));
+        m_closed = true;
         later(&SmtpSession::connectionTerminated);
     }
     QByteArray lastResponse() const override { return m_last; }
     QString errorString() const override {
-        return m_script.loseConnectionOnSend
+        return m_script.loseConnectionOnSend || m_script.dropWhenIdle
                    ? QStringLiteral("The remote host closed the connection")
                    : QString();
     }
 
 private:
+    void note(const QString& call) { m_transcript << QStringLiteral("smtp: ") + call; }
     void later(void (SmtpSession::*signal)()) {
         QMetaObject::invokeMethod(
-            this, [this, signal] { Q_EMIT(this->*signal)
-                                   (); }, Qt::QueuedConnection);
+            this, [this, signal] { Q_EMIT(this->*signal)(); }, Qt::QueuedConnection);
     }
 
     Script m_script;
-    QStringList& m_calls;
+    QStringList& m_transcript;
     QByteArray m_message;
     QByteArray m_last;
-    bool m_tls = false;
+    bool m_tls;
+    bool m_closed = false;
 };

@@ -27,7 +27,9 @@ protected:
         ASSERT_TRUE(folder.isValid());
         clearSettings();
         book = std::make_unique<AddressBook>(folder.filePath(QStringLiteral("book.sqlite")));
-        window = std::make_unique<MainWindow>(*book, keyring);
+        window = std::make_unique<MainWindow>(*book, keyring, mailSettings);
+        pelmo = std::make_unique<PelmoController>(*window, *book, keyring, mailSettings);
+        window->setController(*pelmo);
         controller().startUp();
         window->show();
         ASSERT_TRUE(QTest::qWaitForWindowExposed(window.get()));
@@ -35,11 +37,12 @@ protected:
 
     void TearDown() override {
         window.reset();
+        pelmo.reset();
         // Message boxes and dialogs that deleted themselves later go now.
         QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
     }
 
-    PelmoController& controller() const { return window->controller(); }
+    PelmoController& controller() const { return *pelmo; }
     PeoplePicker& picker() const { return window->peoplePicker(); }
 
     /** The child of parent (the main window by default) with that object name. */
@@ -48,17 +51,6 @@ protected:
         T* found = (parent ? parent : window.get())->findChild<T*>(QLatin1String(name));
         EXPECT_NE(found, nullptr) << "no " << name;
         return found;
-    }
-
-    /** Runs the event loop until done() holds or a generous deadline passes; answers done(). */
-    static bool waitUntil(const std::function<bool()>& done) {
-        QEventLoop loop;
-        QTimer deadline;
-        deadline.setSingleShot(true);
-        deadline.start(5000);
-        while (!done() && deadline.isActive())
-            loop.processEvents(QEventLoop::WaitForMoreEvents, 20);
-        return done();
     }
 
     /** Makes w the active window, as a click on it would. */
@@ -97,6 +89,8 @@ protected:
 
     QTemporaryDir folder;
     FakeKeyring keyring;
+    MailSettings mailSettings;
     std::unique_ptr<AddressBook> book;
     std::unique_ptr<MainWindow> window;
+    std::unique_ptr<PelmoController> pelmo;
 };

@@ -1,7 +1,8 @@
 #include "GuiFixture.h"
+#include "controller/RecipientSelection.h"
 #include "controller/ScriptedSession.h"
+#include "controller/SentRecipients.h"
 #include "e2e/E2eSupport.h"
-#include "gui/RecipientsModel.h"
 #include "gui/RecipientsWindow.h"
 
 #include <QAction>
@@ -32,7 +33,7 @@ protected:
         controller().setSessionFactory([this](const QString&, int) -> SmtpSession* {
             return new ScriptedSession(script, calls);
         });
-        QObject::connect(&controller(), &PelmoController::runIdle, [this] { idle = true; });
+        QObject::connect(&controller(), &PelmoController::runSettled, [this] { idle = true; });
         sendButton = child<QPushButton>("sendButton");
         spinner = child<QProgressBar>("spinner");
     }
@@ -46,12 +47,13 @@ protected:
         QCoreApplication::processEvents();
     }
 
+    // The table as shown: the row's number, then the address.
     QStringList table() const {
-        const RecipientsModel& model = window->recipientsWindow().model();
+        const QAbstractItemModel* model = window->recipientsWindow().table().model();
         QStringList rows;
-        for (int row = 0; row < model.rowCount(); ++row)
-            rows << model.index(row, 0).data().toString() + QLatin1Char(' ') +
-                        model.index(row, 1).data().toString();
+        for (int row = 0; row < model->rowCount(); ++row)
+            rows << model->headerData(row, Qt::Vertical).toString() + QLatin1Char(' ') +
+                        model->index(row, 0).data().toString();
         return rows;
     }
 
@@ -79,8 +81,8 @@ TEST_F(WindowRun, SendMailsTheTypedRecipientAndFillsTheTable) {
     EXPECT_NE(spinner->maximum(), 0) << "still spinning after the run";
     EXPECT_TRUE(
         child<QLabel>("status")->text().startsWith(QStringLiteral("[Mailing completed at ")));
-    EXPECT_EQ(calls.filter(QStringLiteral("message to")),
-              QStringList{QStringLiteral("message to ann@example.org")});
+    EXPECT_EQ(calls.filter(QStringLiteral("smtp: message")),
+              QStringList{QStringLiteral("smtp: message from me@example.org to ann@example.org")});
 }
 
 TEST_F(WindowRun, SendThroughARealServerFillsTheTable) {
@@ -214,7 +216,8 @@ TEST_F(Window, BoldSwitchedOnAndOffWhileTypingFormatsOnlyWhatWasTypedBetween) {
 
 TEST_F(Window, OnlyTheUsersEditsOfToAndNameDropAGroupSelection) {
     addPerson("Ann", "Test", {"ann@example.org"}, {QStringLiteral("Club")});
-    controller().setPeople(book->members(book->groupNamed(QStringLiteral("Club"))->id).value());
+    controller().selection().setPeople(
+        book->members(book->groupNamed(QStringLiteral("Club"))->id).value());
     window->setTo(QStringLiteral("set by the controller"));
     window->setName(QStringLiteral("set by the controller"));
     QTest::keyClicks(child<QLineEdit>("subject"), QStringLiteral("News"));
@@ -223,7 +226,8 @@ TEST_F(Window, OnlyTheUsersEditsOfToAndNameDropAGroupSelection) {
     QTest::keyClicks(child<QLineEdit>("name"), QStringLiteral("x"));
     EXPECT_FALSE(controller().getPeople().has_value());
 
-    controller().setPeople(book->members(book->groupNamed(QStringLiteral("Club"))->id).value());
+    controller().selection().setPeople(
+        book->members(book->groupNamed(QStringLiteral("Club"))->id).value());
     QTest::keyClicks(child<QLineEdit>("to"), QStringLiteral("x"));
     EXPECT_FALSE(controller().getPeople().has_value());
 }

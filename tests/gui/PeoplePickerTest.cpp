@@ -1,4 +1,5 @@
 #include "GuiFixture.h"
+#include "controller/RecipientSelection.h"
 #include "gui/PersonDialog.h"
 
 #include <QInputDialog>
@@ -95,7 +96,7 @@ TEST_F(Picker, OfSeveralGroupsOnlyTheFirstCounts) {
 }
 
 TEST_F(Picker, APersonChosenInTheActivePickerIsOneMessage) {
-    controller().setPeople(book->persons());
+    controller().selection().setPeople(book->persons());
     ASSERT_TRUE(activate(&picker()));
     clickRow(persons, QStringLiteral("Ann Able"));
     EXPECT_FALSE(controller().getPeople().has_value());
@@ -109,7 +110,7 @@ TEST_F(Picker, APersonChosenInTheActivePickerIsOneMessage) {
 }
 
 TEST_F(Picker, APersonChosenWhileThePickerIsNotKeyOnlyDropsTheSelection) {
-    controller().setPeople(book->persons());
+    controller().selection().setPeople(book->persons());
     window->setTo(QStringLiteral("kept@example.org"));
     window->setName(QStringLiteral("Kept"));
     ASSERT_TRUE(activate(window.get()));

@@ -57,8 +57,12 @@ TEST_F(Preferences, ShowsTheStoredSettings) {
               QStringLiteral("CRAM-MD5"));
     EXPECT_EQ(field<QComboBox>(dialog, "completionAction")->currentIndex(), 2);
     EXPECT_EQ(field<QLineEdit>(dialog, "loginPassword")->echoMode(), QLineEdit::Password);
-    EXPECT_EQ(field<QLabel>(dialog, "passwordNote")->text(),
-              QStringLiteral("The password is kept in the system keyring."));
+    // The keyring answers in the background.
+    EXPECT_TRUE(waitUntil([&] {
+        return field<QLabel>(dialog, "passwordNote")->text() ==
+               QStringLiteral("The password is kept in the system keyring.");
+    }));
+    EXPECT_EQ(field<QLineEdit>(dialog, "loginPassword")->text(), QStringLiteral("s3cret"));
 }
 
 TEST_F(Preferences, OkStoresWhatTheControllerReads) {
@@ -86,9 +90,8 @@ TEST_F(Preferences, OkStoresWhatTheControllerReads) {
     EXPECT_EQ(controller().getSelectedContentType(), 1);
     EXPECT_EQ(controller().getSelectedCharacterSet(), 2);
     EXPECT_EQ(controller().getUsername(), QStringLiteral("me"));
-    EXPECT_EQ(controller().getPassword(), QStringLiteral("s3cret"));
     // The keyring took the password: the settings file holds no copy of it.
-    EXPECT_EQ(keyring.stored, QStringLiteral("s3cret"));
+    EXPECT_TRUE(waitUntil([&] { return keyring.stored == QStringLiteral("s3cret"); }));
     EXPECT_FALSE(stored("loginPassword").isValid());
 }
 
@@ -100,7 +103,7 @@ TEST_F(Preferences, WithoutAKeyringThePasswordGoesToTheSettingsAndTheDialogSaysS
     EXPECT_TRUE(note->text().startsWith(QStringLiteral("No keyring answered")));
     QTest::keyClicks(field<QLineEdit>(dialog, "loginPassword"), QStringLiteral("s3cret"));
     dialog->save();
-    EXPECT_EQ(stored("loginPassword").toString(), QStringLiteral("s3cret"));
+    EXPECT_TRUE(waitUntil([] { return stored("loginPassword").toString() == "s3cret"; }));
     EXPECT_TRUE(note->text().contains(settings().fileName())) << note->text().toStdString();
     EXPECT_TRUE(note->text().contains(QStringLiteral("the password is kept")));
 }
@@ -109,9 +112,11 @@ TEST_F(Preferences, ClearingThePasswordRemovesItEverywhere) {
     keyring.stored = QStringLiteral("old");
     PreferencesDialog* dialog = open();
     ASSERT_NE(dialog, nullptr);
+    ASSERT_TRUE(
+        waitUntil([&] { return !field<QLineEdit>(dialog, "loginPassword")->text().isEmpty(); }));
     retype(field<QLineEdit>(dialog, "loginPassword"), QString());
     dialog->accept();
-    EXPECT_TRUE(keyring.stored.isEmpty());
+    EXPECT_TRUE(waitUntil([&] { return keyring.stored.isEmpty(); }));
     EXPECT_FALSE(stored("loginPassword").isValid());
 }
 

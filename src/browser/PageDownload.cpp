@@ -1,8 +1,7 @@
-#include "relink/browser/FrontBrowser.h"
+#include "browser/PageDownload.h"
 
 #include "util/TextUtilities.h"
 
-#include <QEventLoop>
 #include <QNetworkAccessManager>
 #include <QNetworkReply>
 #include <QNetworkRequest>
@@ -58,37 +57,60 @@ QString decodePage(const QNetworkReply& reply, const QByteArray& bytes) {
 
 } // namespace
 
-QString DownloadURL(const QString& url, std::chrono::milliseconds timeout, QString* error) {
+PageDownload::PageDownload(QObject* parent)
+    : QObject(parent), m_network(new QNetworkAccessManager(this)) {}
+
+PageDownload::~PageDownload() {
+    if (m_reply)
+        m_reply->abort();
+}
+
+void PageDownload::start(const QString& url, std::chrono::milliseconds timeout) {
+    m_state = State::Downloading;
     const QUrl address(url, QUrl::StrictMode);
     if (!address.isValid() || address.scheme().isEmpty()) {
-        if (error != nullptr)
-            *error = QStringLiteral("not a valid address");
-        return {};
+        QMetaObject::invokeMethod(
+            this, [this] { finish({}, QStringLiteral("not a valid address")); },
+            Qt::QueuedConnection);
+        return;
     }
-    QNetworkAccessManager network;
     QNetworkRequest request(address);
     request.setAttribute(QNetworkRequest::RedirectPolicyAttribute,
                          QNetworkRequest::NoLessSafeRedirectPolicy);
     request.setAttribute(QNetworkRequest::CacheLoadControlAttribute,
                          QNetworkRequest::AlwaysNetwork);
     request.setTransferTimeout(static_cast<int>(timeout.count()));
-    std::unique_ptr<QNetworkReply> reply(network.get(request));
-    QEventLoop loop;
-    QObject::connect(reply.get(), &QNetworkReply::finished, &loop, &QEventLoop::quit);
-    loop.exec(QEventLoop::ExcludeUserInputEvents);
-    if (reply->error() != QNetworkReply::NoError) {
-        if (error != nullptr)
-            *error = reply->errorString();
-        return {};
+    m_reply = m_network->get(request);
+    connect(m_reply, &QNetworkReply::finished, this, &PageDownload::replied);
+}
+
+void PageDownload::abort() {
+    if (m_state != State::Downloading)
+        return;
+    m_state = State::Aborted;
+    if (m_reply) {
+        disconnect(m_reply, nullptr, this, nullptr);
+        m_reply->abort();
+        m_reply->deleteLater();
     }
+}
+
+void PageDownload::replied() {
+    QNetworkReply* reply = m_reply;
+    reply->deleteLater();
+    if (reply->error() != QNetworkReply::NoError)
+        return finish({}, reply->errorString());
     const QByteArray bytes = reply->readAll();
-    if (bytes.isEmpty()) {
-        if (error != nullptr)
-            *error = QStringLiteral("the page is empty");
-        return {};
-    }
+    if (bytes.isEmpty())
+        return finish({}, QStringLiteral("the page is empty"));
     const QString text = decodePage(*reply, bytes);
-    if (text.isNull() && error != nullptr)
-        *error = QStringLiteral("the page's characters cannot be read");
-    return text;
+    finish(text,
+           text.isNull() ? QStringLiteral("the page's characters cannot be read") : QString());
+}
+
+void PageDownload::finish(const QString& text, const QString& error) {
+    if (m_state != State::Downloading)
+        return;
+    m_state = State::Finished;
+    Q_EMIT finished(text, error);
 }

@@ -1,0 +1,185 @@
+#include "controller/MailSettings.h"
+
+#include "util/AppIdentity.h"
+#include "util/LocalizedStrings.h"
+#include "util/PelmoException.h"
+#include "util/PrivateFiles.h"
+
+#include <QFileInfo>
+
+#include <iterator>
+
+namespace {
+
+using Key = MailSettings::Key;
+
+// Each setting: its stored name, what a form suggests when it is missing, and for the required
+// ones the failure raised when it is missing or empty. A missing integer reads 0 and a missing
+// boolean false, whatever the form suggests.
+struct Row {
+    Key key;
+    const char* name;
+    QVariant suggested;
+    const char* failure;
+    const char* reason;
+};
+
+const Row kTable[] = {
+    {Key::SenderEmail,
+     "senderEmail",
+     {},
+     "NoSenderEmailAddress",
+     "The sender 'Email Address:' preference value has not been specified."},
+    {Key::SenderName,
+     "senderName",
+     {},
+     "NoSenderName",
+     "The sender 'Name:' preference value has not been specified."},
+    {Key::DefaultRecipientEmail, "defaultRecipientEmail", {}, nullptr, nullptr},
+    {Key::DefaultRecipientName, "defaultRecipientName", {}, nullptr, nullptr},
+    {Key::SelectedContentType, "selectedContentType", 0, nullptr, nullptr},
+    {Key::SelectedCharacterSet, "selectedCharacterSet", 0, nullptr, nullptr},
+    {Key::SelectedAuthentication, "selectedAuthentication", 0, nullptr, nullptr},
+    {Key::UseSSL, "useSSL", false, nullptr, nullptr},
+    {Key::ServerAddress,
+     "serverAddress",
+     {},
+     "NoServer",
+     "The outgoing SMTP server 'Address:' preference value has not been specified."},
+    {Key::ServerPort, "serverPort", 25, "BadPort",
+     "The outgoing SMTP server 'Port:' preference value is out of range."},
+    {Key::CompletionAction, "completionAction", 0, nullptr, nullptr},
+    {Key::LoginUsername,
+     "loginUsername",
+     {},
+     "NoUsername",
+     "The outgoing SMTP server 'Username:' preference value has not been specified."},
+    {Key::LoginPassword,
+     "loginPassword",
+     {},
+     "NoPassword",
+     "The outgoing SMTP server 'Password:' preference value has not been specified."},
+    // Seconds for both waiting limits of a connection; 0 keeps the transport's own.
+    {Key::SmtpTimeout, "smtpTimeout", 0, nullptr, nullptr},
+    // Implicit TLS on a port other than 465.
+    {Key::ImplicitTLS, "implicitTLS", false, nullptr, nullptr},
+};
+
+const Row& rowOf(Key key) {
+    return kTable[static_cast<int>(key)];
+}
+
+PelmoException failureOf(Key key) {
+    const Row& row = rowOf(key);
+    return PelmoException(QString::fromLatin1(row.failure), LocalizedStringNS(row.reason));
+}
+
+std::filesystem::path pathOf(const QString& name) {
+    return std::filesystem::path(name.toStdString());
+}
+
+} // namespace
+
+MailSettings::MailSettings()
+    : store(QString::fromLatin1(kOrganisationName), QString::fromLatin1(kApplicationName)) {
+    static_assert(std::size(kTable) == static_cast<size_t>(Key::ImplicitTLS) + 1);
+    // The file may hold the password when no keyring answers: made private before anything is
+    // written to it, and tightened when an older Pelmo left it readable.
+    const QFileInfo file(store.fileName());
+    if (MakePrivateFolder(pathOf(file.absolutePath())))
+        MakePrivateFile(pathOf(file.absoluteFilePath()));
+}
+
+QString MailSettings::name(Key key) {
+    return QString::fromLatin1(rowOf(key).name);
+}
+
+std::optional<MailSettings::Key> MailSettings::keyNamed(const QString& name) {
+    for (const Row& row : kTable)
+        if (name == QLatin1String(row.name))
+            return row.key;
+    return std::nullopt;
+}
+
+QStringList MailSettings::names() {
+    QStringList all;
+    for (const Row& row : kTable)
+        all << QString::fromLatin1(row.name);
+    return all;
+}
+
+QVariant MailSettings::suggested(Key key) {
+    return rowOf(key).suggested;
+}
+
+QVariant MailSettings::value(Key key) {
+    const auto overridden = overrides.constFind(name(key));
+    if (overridden != overrides.constEnd())
+        return overridden.value();
+    store.sync();
+    return store.value(name(key));
+}
+
+bool MailSettings::contains(Key key) {
+    return value(key).isValid();
+}
+
+QString MailSettings::string(Key key) {
+    const QVariant stored = value(key);
+    if (!stored.isValid())
+        return {};
+    // A comma left unquoted in a hand-edited settings file makes QSettings read a list.
+    if (stored.typeId() == QMetaType::QStringList)
+        return stored.toStringList().join(QStringLiteral(", "));
+    return stored.toString();
+}
+
+int MailSettings::integer(Key key) {
+    return value(key).toInt();
+}
+
+bool MailSettings::boolean(Key key) {
+    return value(key).toBool();
+}
+
+QString MailSettings::required(Key key) {
+    const QString stored = string(key);
+    if (stored.isEmpty())
+        throw failureOf(key);
+    return stored;
+}
+
+int MailSettings::port() {
+    const int stored = integer(Key::ServerPort);
+    // One unsigned comparison: 0 (a missing port too) and anything above 65365 fail. The
+    // bound is 65365, not 65535, and stays so.
+    if (static_cast<unsigned>(stored) - 1u > 65364u)
+        throw failureOf(Key::ServerPort);
+    return stored;
+}
+
+bool MailSettings::isOverridden(Key key) const {
+    return overrides.contains(name(key));
+}
+
+void MailSettings::setValue(Key key, const QVariant& newValue) {
+    if (newValue.typeId() == QMetaType::QString && newValue.toString().isEmpty())
+        return remove(key);
+    store.setValue(name(key), newValue);
+    sync();
+}
+
+void MailSettings::remove(Key key) {
+    store.remove(name(key));
+    sync();
+}
+
+void MailSettings::overrideValue(Key key, const QVariant& newValue) {
+    overrides.insert(name(key), newValue);
+}
+
+void MailSettings::sync() {
+    store.sync();
+    // Saving replaces the file; the new one must be as private as the old.
+    MakePrivateFile(pathOf(store.fileName()));
+}

@@ -1,0 +1,85 @@
+#pragma once
+
+#include <QSettings>
+#include <QString>
+#include <QStringList>
+#include <QVariant>
+#include <QVariantMap>
+
+#include <optional>
+
+/**
+ * Pelmo's settings: the one table of their keys, types, defaults and validation. The
+ * controller, the preferences and `pelmo send --set` read and write through it, so a key is
+ * spelled here and nowhere else.
+ *
+ * Every read first syncs the store, so that a change the preferences (or another process) just
+ * saved is seen by the next message. A value overridden for this process (a command-line run
+ * with another server) wins over the stored one and is never written. The settings folder and
+ * file are kept private to the user (0700, 0600), as they may hold the password.
+ */
+class MailSettings {
+public:
+    enum class Key {
+        SenderEmail,
+        SenderName,
+        DefaultRecipientEmail,
+        DefaultRecipientName,
+        SelectedContentType,
+        SelectedCharacterSet,
+        SelectedAuthentication,
+        UseSSL,
+        ServerAddress,
+        ServerPort,
+        CompletionAction,
+        LoginUsername,
+        LoginPassword,
+        SmtpTimeout,
+        ImplicitTLS,
+    };
+
+    /** The store of the current user; makes its folder and file private. */
+    MailSettings();
+
+    /** The key as stored in the settings file (such as the sender's address key). */
+    static QString name(Key key);
+    /** The key stored under name, if it is one of ours. */
+    static std::optional<Key> keyNamed(const QString& name);
+    /** Every key's name, in table order. */
+    static QStringList names();
+    /** The value a form shows for a key that is not stored (port 25); invalid for none. */
+    static QVariant suggested(Key key);
+
+    /** The overridden value, else the stored one (synced first); invalid when neither. */
+    QVariant value(Key key);
+    bool contains(Key key);
+    /** A string setting; null when missing. A list (an unquoted comma) reads joined. */
+    QString string(Key key);
+    /** An integer setting; 0 when missing or not a number. */
+    int integer(Key key);
+    /** A boolean setting; false when missing. */
+    bool boolean(Key key);
+    /**
+     * A setting that must be present and non-empty; throws PelmoException with the key's
+     * failure name and reason otherwise.
+     */
+    QString required(Key key);
+    /** The server port, 1 to 65365 inclusive; throws BadPort otherwise (missing is 0). */
+    int port();
+    bool isOverridden(Key key) const;
+
+    /** Stores value (an empty string removes the key) and writes the file at once. */
+    void setValue(Key key, const QVariant& value);
+    void remove(Key key);
+    /** Makes value stand for key in this process only, without writing it. */
+    void overrideValue(Key key, const QVariant& value);
+    /** Writes pending changes and re-reads what another process saved. */
+    void sync();
+
+    /** The settings file's path, for telling the user where a password is kept. */
+    QString fileName() const { return store.fileName(); }
+
+private:
+    QSettings store;
+    QVariantMap overrides;
+};

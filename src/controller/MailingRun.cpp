@@ -1,0 +1,303 @@
+#include "controller/MailingRun.h"
+
+#include "attachments/AttachmentsController.h"
+#include "browser/PageDownload.h"
+#include "controller/MailSettings.h"
+#include "controller/MessageTemplate.h"
+#include "controller/PasswordStore.h"
+#include "controller/PelmoView.h"
+#include "controller/RecipientSelection.h"
+#include "controller/SentRecipients.h"
+#include "relink/Relink.h"
+#include "relink/SuffixMap.h"
+#include "smtp/SMTP.h"
+#include "smtp/SmtpSession.h"
+#include "util/LocalizedStrings.h"
+#include "util/TextUtilities.h"
+
+#include <QDateTime>
+
+namespace {
+
+using Key = MailSettings::Key;
+
+QString now() {
+    return DateDescription(QDateTime::currentDateTime());
+}
+
+} // namespace
+
+MailingRun::MailingRun(const Parts& parts, QObject* parent) : QObject(parent), m_parts(parts) {}
+
+MailingRun::~MailingRun() = default;
+
+void MailingRun::enter(State state) {
+    if (m_state == state)
+        return;
+    m_state = state;
+    Q_EMIT stateChanged(state);
+}
+
+void MailingRun::settleUnlessDelivering() {
+    const bool waiting = m_delivery && m_delivery->state() != SMTP::State::Aborted &&
+                         m_delivery->state() != SMTP::State::Stalled;
+    if (!waiting && m_state != State::PreparingPage)
+        Q_EMIT settled();
+}
+
+// The page
+
+void MailingRun::start() {
+    m_typedAddress = m_parts.view.webPageOrFile();
+    const QString address = m_typedAddress.toLower();
+    if (!address.startsWith(QLatin1String("http://")) &&
+        !address.startsWith(QLatin1String("https://")))
+        return pageReady(QString());
+    // Stop must be pressable while the page downloads.
+    m_parts.view.setSendButtonTitle(LocalizedStringNS("Stop"));
+    enter(State::PreparingPage);
+    status(QStringLiteral("Downloading \"%1\"").arg(address));
+    // The whole address is fetched lower-cased; links are resolved against it as typed.
+    m_download = new PageDownload(this);
+    connect(m_download, &PageDownload::finished, this,
+            [this, address](const QString& page, const QString&) {
+                m_download->deleteLater();
+                if (page.isNull()) {
+                    status(QStringLiteral("Could not download \"%1\"").arg(address));
+                    return pageReady(QString());
+                }
+                const QByteArray bytes = page.toUtf8();
+                CText text("");
+                text.append(bytes.constData(), bytes.size());
+                status(QStringLiteral("Relinking web page..."));
+                // Reading the MIME database takes a tenth of a second: only runs with a page
+                // pay for it.
+                EnsureSuffixMap();
+                relink(CString256(m_typedAddress.toUtf8().constData()), text);
+                pageReady(QString::fromUtf8(text.buffer(), text.length()));
+            });
+    m_download->start(address);
+}
+
+void MailingRun::pageReady(const QString& page) {
+    m_parts.message.setPage(page);
+    beginDeliveries();
+}
+
+// The run
+
+void MailingRun::beginDeliveries() {
+    m_parts.view.setSendButtonTitle(LocalizedStringNS("Stop"));
+    m_stopSending = false;
+    enter(State::Delivering);
+    status(LocalizedStringNS("Sending mail."));
+    m_parts.settings.sync();
+    if (const auto& people = m_parts.selection.getPeople()) {
+        m_parts.view.setProgressCounting(0.0, static_cast<double>(people->size()), 0.0);
+        sendMember();
+    } else {
+        m_parts.view.setProgressBusy();
+        deliver();
+    }
+    settleUnlessDelivering();
+}
+
+bool MailingRun::sendMember() {
+    if (m_stopSending)
+        return false;
+    const auto& people = m_parts.selection.getPeople();
+    if (!people || people->isEmpty()) {
+        endRun();
+        return false;
+    }
+    PelmoView& view = m_parts.view;
+    view.setProgressValue(view.progressMaximum() - static_cast<double>(people->size()) + 1.0);
+    const Person person = m_parts.selection.takeFirst();
+    view.setName(RecipientSelection::firstAndLastName(person));
+    // A person without an address is taken off all the same: the run stalls there, since the
+    // next person is only taken when a connection closes.
+    if (person.emails.isEmpty()) {
+        enter(State::Stalled);
+    } else {
+        view.setTo(person.primaryEmail());
+        deliver();
+    }
+    return true;
+}
+
+void MailingRun::deliver() {
+    status(LocalizedStringNS("[Mailing started at ") + now() + LocalizedStringNS("]"));
+    if (!m_parts.selection.getPeople())
+        m_parts.view.startProgressAnimation();
+    DeliveryRequest request;
+    try {
+        request = buildRequest();
+    } catch (const PelmoException& failure) {
+        return halt(failure);
+    }
+    auto* delivery = new SMTP(request, m_parts.createSession(request.server, request.port), this);
+    m_delivery = delivery;
+    enter(State::Delivering);
+    connect(delivery, &SMTP::statusMessage, this, &MailingRun::statusMessage);
+    connect(delivery, &SMTP::accepted, &m_parts.sent, &SentRecipients::addRecipient);
+    connect(delivery, &SMTP::refused, this, [this] {
+        m_everyCopyAccepted = false;
+        m_parts.view.beep();
+        abort();
+    });
+    connect(delivery, &SMTP::stalled, this, [this] {
+        m_everyCopyAccepted = false;
+        enter(State::Stalled);
+        settleUnlessDelivering();
+    });
+    connect(delivery, &SMTP::finished, this, [this, delivery] { deliveryFinished(delivery); });
+    delivery->start();
+}
+
+// The settings and texts are read in the order a message is built, so that the first missing
+// one is the one reported.
+DeliveryRequest MailingRun::buildRequest() {
+    MessageTemplate& message = m_parts.message;
+    MailSettings& settings = m_parts.settings;
+    DeliveryRequest request;
+    request.subject = message.getSubject();
+    request.senderName = message.getFromName();
+    request.sender = message.getFrom();
+    request.recipientName = message.getToName();
+    request.recipient = message.getTo();
+    status(QLatin1Char('[') + now() + QLatin1Char(']') + LocalizedStringNS(" Mail to: ") +
+           request.recipientName + QLatin1String(" <") + request.recipient + QLatin1Char('>'));
+    request.characterSet = settings.integer(Key::SelectedCharacterSet);
+    switch (settings.integer(Key::SelectedContentType)) {
+    case 0:
+        request.bodyParts.append({message.getHTMLMessage(), QStringLiteral("text/html")});
+        break;
+    case 1:
+        request.bodyParts.append({message.getMessage(), QStringLiteral("text/plain")});
+        break;
+    default:
+        break;
+    }
+    if (const QString page = message.getWebPageOrFileContents(); !page.isNull())
+        request.bodyParts.append({page, QStringLiteral("text/html")});
+    request.attachments = m_parts.attachments.getAttachments();
+    request.server = settings.required(Key::ServerAddress);
+    request.port = settings.port();
+    request.useSSL = settings.boolean(Key::UseSSL);
+    request.loginMechanism = settings.integer(Key::SelectedAuthentication);
+    request.credentials = [this](std::function<void(const Credentials&)> answer) {
+        askCredentials(answer);
+    };
+    return request;
+}
+
+// The user name, then the password: a password given for this run, else the keyring's, else
+// the settings key's.
+void MailingRun::askCredentials(const std::function<void(const Credentials&)>& answer) {
+    MailSettings& settings = m_parts.settings;
+    Credentials credentials;
+    const auto passwordFromSettings = [&settings](Credentials& login) {
+        try {
+            login.password = settings.required(Key::LoginPassword);
+        } catch (const PelmoException& failure) {
+            login.failure = failure;
+        }
+    };
+    try {
+        credentials.user = settings.required(Key::LoginUsername);
+    } catch (const PelmoException& failure) {
+        credentials.failure = failure;
+        return answer(credentials);
+    }
+    if (settings.isOverridden(Key::LoginPassword)) {
+        passwordFromSettings(credentials);
+        return answer(credentials);
+    }
+    m_parts.passwords.readPassword(
+        MailSettings::name(Key::LoginPassword), this,
+        [credentials, answer, passwordFromSettings](const QString& fromKeyring) mutable {
+            if (fromKeyring.isEmpty())
+                passwordFromSettings(credentials);
+            else
+                credentials.password = fromKeyring;
+            answer(credentials);
+        });
+}
+
+void MailingRun::deliveryFinished(SMTP* delivery) {
+    delivery->deleteLater();
+    if (m_delivery == delivery)
+        m_delivery = nullptr;
+    switch (delivery->state()) {
+    case SMTP::State::Ended:
+        if (!delivery->succeeded())
+            m_everyCopyAccepted = false;
+        // The next person's delivery, if any, starts before this one is done with.
+        if (!sendMember())
+            finishRun(delivery->succeeded());
+        break;
+    case SMTP::State::TimedOut:
+        // The run stops here with Stop showing: every later copy would fail alike.
+        m_everyCopyAccepted = false;
+        enter(State::Stalled);
+        break;
+    default:
+        m_everyCopyAccepted = false;
+        showHalted();
+        break;
+    }
+    settleUnlessDelivering();
+}
+
+void MailingRun::halt(const PelmoException& failure) {
+    m_everyCopyAccepted = false;
+    status(LocalizedFormat("Error (%@): %@", {failure.name(), failure.reason()}));
+    showHalted();
+}
+
+void MailingRun::showHalted() {
+    PelmoView& view = m_parts.view;
+    // Start, then stop at once: the indicator ends spinning and still, whatever it showed.
+    if (m_parts.selection.getPeople()) {
+        view.setProgressBusy();
+        view.startProgressAnimation();
+    }
+    view.stopProgressAnimation();
+    view.setSendButtonTitle(LocalizedStringNS("Send"));
+    enter(State::Halted);
+}
+
+void MailingRun::endRun() {
+    PelmoView& view = m_parts.view;
+    view.setProgressBusy();
+    view.startProgressAnimation();
+    view.stopProgressAnimation();
+    m_parts.selection.clear();
+    status(LocalizedStringNS("[Mailing completed at ") + now() + QStringLiteral("]"));
+    view.setSendButtonTitle(LocalizedStringNS("Send"));
+    enter(State::Completed);
+}
+
+void MailingRun::finishRun(bool succeeded) {
+    if (!m_parts.selection.getPeople())
+        m_parts.view.stopProgressAnimation();
+    // A stopped run has persons left for the next Send: neither quitting nor clearing the
+    // form may follow it.
+    if (!succeeded || m_stopSending)
+        return;
+    const int action = m_parts.settings.integer(Key::CompletionAction);
+    if (action == 1 || action == 2)
+        Q_EMIT completionActionWanted(action);
+}
+
+void MailingRun::abort() {
+    m_parts.view.stopProgressAnimation();
+    m_stopSending = true;
+    m_parts.view.setSendButtonTitle(LocalizedStringNS("Send"));
+    if (m_download) {
+        m_download->abort();
+        m_download->deleteLater();
+    }
+    enter(State::Stopped);
+    settleUnlessDelivering();
+}

@@ -1,0 +1,106 @@
+#pragma once
+
+#include "smtp/DeliveryRequest.h"
+
+#include <QObject>
+#include <QPointer>
+
+#include <functional>
+
+class AttachmentsController;
+class MailSettings;
+class MessageTemplate;
+class PageDownload;
+class PasswordStore;
+class PelmoView;
+class RecipientSelection;
+class SMTP;
+class SentRecipients;
+class SmtpSession;
+
+/**
+ * One press of Send: the web page is downloaded and relinked, then one copy is delivered to the
+ * To field, or one to each pending person of the selection, strictly one after another: the
+ * next person's delivery starts only when the previous connection has closed. Progress goes to
+ * the view's bar and Send/Stop button, every step to statusMessage().
+ *
+ * The parts are not owned and must outlive the run. A run stopped by the user lets the copy on
+ * its way finish and leaves the persons not yet mailed pending for the next Send.
+ */
+class MailingRun : public QObject {
+    Q_OBJECT
+
+public:
+    /** A new session for one delivery to host:port; the caller takes it over. */
+    using SessionFactory = std::function<SmtpSession*(const QString& host, int port)>;
+
+    struct Parts {
+        PelmoView& view;
+        MailSettings& settings;
+        MessageTemplate& message;
+        RecipientSelection& selection;
+        SentRecipients& sent;
+        PasswordStore& passwords;
+        const AttachmentsController& attachments;
+        SessionFactory createSession;
+    };
+
+    enum class State {
+        Idle,          ///< start() not yet called
+        PreparingPage, ///< the web page is downloading; Stop ends the run at once
+        Delivering,    ///< a copy is on its way (the To field's, or member n's)
+        Stalled,       ///< cannot go on by itself (no address, a time-out, an unknown login
+                       ///< mechanism); the button still reads Stop
+        Halted,        ///< a setting or the message failed: the button reads Send, nothing starts
+        Stopped,       ///< Stop pressed or a copy refused; the rest wait for the next Send
+        Completed,     ///< every member taken, the end-of-run line shown
+    };
+    Q_ENUM(State)
+
+    MailingRun(const Parts& parts, QObject* parent = nullptr);
+    ~MailingRun() override;
+
+    /** Starts the run; the view's button must read "Send". */
+    void start();
+    /** Stops the run after the delivery in progress, or at once while the page downloads. */
+    void abort();
+
+    State state() const { return m_state; }
+    /** Whether a delivery of this run has not ended yet. */
+    bool isDelivering() const { return !m_delivery.isNull(); }
+    /** False once any copy of this run was not accepted (refused, login failed, halted). */
+    bool everyCopyAccepted() const { return m_everyCopyAccepted; }
+
+Q_SIGNALS:
+    /** A line for the status line and the activity log. */
+    void statusMessage(const QString& text);
+    void stateChanged(MailingRun::State state);
+    /** The last copy was accepted and the run is over: action 1 quits, 2 resets the form. */
+    void completionActionWanted(int action);
+    /** Nothing of this run is under way any more unless the user or a server acts. */
+    void settled();
+
+private:
+    void pageReady(const QString& page);
+    void beginDeliveries();
+    bool sendMember();
+    void deliver();
+    DeliveryRequest buildRequest();
+    void askCredentials(const std::function<void(const Credentials&)>& answer);
+    void deliveryFinished(SMTP* delivery);
+    void endRun();
+    void finishRun(bool succeeded);
+    void halt(const PelmoException& failure);
+    void showHalted();
+    void enter(State state);
+    void status(const QString& text) { Q_EMIT statusMessage(text); }
+    void settleUnlessDelivering();
+
+    Parts m_parts;
+    State m_state = State::Idle;
+    bool m_stopSending = false;
+    bool m_everyCopyAccepted = true;
+    QString m_typedAddress;
+    QPointer<PageDownload> m_download;
+    QPointer<SMTP> m_delivery;
+};

@@ -1,0 +1,136 @@
+#include "controller/MessageTemplate.h"
+
+#include "controller/MailSettings.h"
+#include "controller/PelmoView.h"
+#include "smtp/HtmlCharset.h"
+#include "util/LocalizedStrings.h"
+#include "util/PelmoException.h"
+
+#include <QTextCursor>
+#include <QTextDocument>
+
+#include <iterator>
+
+namespace {
+
+// Each tag and the getter whose value replaces it. A row is all a new tag takes.
+struct Tag {
+    const char* text;
+    QString (MessageTemplate::*getter)();
+};
+
+constexpr Tag kTags[] = {
+    {"{to}", &MessageTemplate::getTo},           {"{toName}", &MessageTemplate::getToName},
+    {"{from}", &MessageTemplate::getFrom},       {"{fromName}", &MessageTemplate::getFromName},
+    {"{subject}", &MessageTemplate::getSubject},
+};
+
+QString replaceInTurn(const QString& text, const QStringList& values) {
+    QString copy = text;
+    for (size_t i = 0; i < std::size(kTags); ++i) {
+        if (!values[i].isNull())
+            copy.replace(QLatin1String(kTags[i].text), values[i], Qt::CaseInsensitive);
+    }
+    return copy;
+}
+
+QString replaceInOnePass(const QString& text, const QStringList& values) {
+    QString result;
+    result.reserve(text.size() + text.size() / 8);
+    qsizetype done = 0;
+    for (qsizetype at = text.indexOf(QLatin1Char('{')); at >= 0;
+         at = text.indexOf(QLatin1Char('{'), at + 1)) {
+        for (size_t i = 0; i < std::size(kTags); ++i) {
+            const QLatin1String tag(kTags[i].text);
+            if (values[i].isNull() ||
+                QStringView(text).mid(at, tag.size()).compare(tag, Qt::CaseInsensitive) != 0)
+                continue;
+            result += QStringView(text).mid(done, at - done);
+            result += values[i];
+            done = at + tag.size();
+            at = done - 1;
+            break;
+        }
+    }
+    result += QStringView(text).mid(done);
+    return result;
+}
+
+QString requiredField(const QString& value, const char* failure, const char* reason) {
+    if (value.isEmpty())
+        throw PelmoException(QString::fromLatin1(failure), LocalizedStringNS(reason));
+    return value;
+}
+
+} // namespace
+
+MessageTemplate::MessageTemplate(PelmoView& pelmoView, MailSettings& mailSettings, QObject* parent)
+    : QObject(parent), view(pelmoView), settings(mailSettings), document(new QTextDocument(this)) {
+    connect(document, &QTextDocument::contentsChanged, this, [this] { plainBody = QString(); });
+}
+
+void MessageTemplate::clearBody() {
+    QTextCursor cursor(document);
+    cursor.select(QTextCursor::Document);
+    cursor.removeSelectedText();
+}
+
+QString MessageTemplate::getTo() {
+    return requiredField(view.to(), "NoRecipientsEmail",
+                         "The 'Recipient Address:' value has not been specified.");
+}
+
+QString MessageTemplate::getToName() {
+    return requiredField(view.name(), "NoRecipientsName",
+                         "The 'Recipients Name:' value has not been specified.");
+}
+
+QString MessageTemplate::getSubject() {
+    return view.subject();
+}
+
+QString MessageTemplate::getFrom() {
+    return settings.required(MailSettings::Key::SenderEmail);
+}
+
+QString MessageTemplate::getFromName() {
+    return settings.required(MailSettings::Key::SenderName);
+}
+
+QString MessageTemplate::getMessage() {
+    // The body's text is exported once per change, not once per copy.
+    if (plainBody.isNull())
+        plainBody = document->toPlainText();
+    return replaceTags(plainBody);
+}
+
+QString MessageTemplate::getHTMLMessage() {
+    const HtmlCharset charset =
+        HtmlCharset::forIndex(settings.integer(MailSettings::Key::SelectedCharacterSet));
+    const QByteArray exported = charset.exportDocument(*document);
+    if (exported.isEmpty())
+        return {};
+    // The tag values come from the fields and settings, so they may hold characters the set
+    // cannot; they are escaped like those of the body.
+    return charset.escapeUnencodable(replaceTags(charset.decode(exported)));
+}
+
+QString MessageTemplate::replaceTags(const QString& text) {
+    if (text.isNull())
+        return {};
+    // A null value (an empty field never set) leaves its tag in the text.
+    QStringList values;
+    bool braced = false;
+    for (const Tag& tag : kTags) {
+        values << (this->*tag.getter)();
+        braced = braced || values.last().contains(QLatin1Char('{')) ||
+                 values.last().contains(QLatin1Char('}'));
+    }
+    // Tag after tag is the rule; when no value holds a brace, no value can take part in
+    // another tag, and one pass over the text gives the same result.
+    return braced ? replaceInTurn(text, values) : replaceInOnePass(text, values);
+}
+
+QString MessageTemplate::getWebPageOrFileContents() {
+    return webPageOrFileContents.isNull() ? QString() : replaceTags(webPageOrFileContents);
+}
