@@ -6,7 +6,7 @@ BUILD_RUN ?= build/run
 JOBS ?= 2
 FUZZ_SECONDS ?= 60
 
-.PHONY: all deps run test bench fuzz clean
+.PHONY: all deps run test bench fuzz mutants clean
 
 all: test
 
@@ -45,6 +45,11 @@ bench: deps
 	cmake --build $(BUILD_BENCH) -j $(JOBS)
 	@for b in $(BUILD_BENCH)/bench/*_bench; do echo "== $$b"; "$$b" || exit 1; done
 	@echo "== scripts/bench-send.sh"; bash scripts/bench-send.sh $(BUILD_BENCH)/src/pelmo
+
+# Plants each fault of scripts/mutants.list in a copy of the tree under build/mutants, one at a
+# time, and tells how many the tests catch. MUTANTS=3,7,12-20,smtp runs only those.
+mutants: deps
+	JOBS=$(JOBS) MUTANTS=$(MUTANTS) bash scripts/mutants.sh
 
 clean:
 	rm -rf build
