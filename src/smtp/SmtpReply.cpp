@@ -90,9 +90,10 @@ SmtpCapabilities SmtpCapabilities::fromEhlo(const SmtpReply& reply) {
                 if (isMechanismName(mechanism) && !capabilities.mechanisms.contains(mechanism))
                     capabilities.mechanisms += mechanism;
         } else if (words[0] == QLatin1String("SIZE")) {
-            // RFC 1870 4: SIZE without a number, or 0, means no fixed limit.
+            // RFC 1870 4: SIZE without a number, or 0, means no fixed limit; a negative one
+            // is no limit either.
             capabilities.size = true;
-            capabilities.sizeLimit = words.size() > 1 ? words[1].toLongLong() : 0;
+            capabilities.sizeLimit = words.size() > 1 ? std::max(words[1].toLongLong(), 0LL) : 0;
         }
     }
     return capabilities;

@@ -1,8 +1,8 @@
 // MessageAssembly fed arbitrary header fields and body parts. Every call either takes its text
 // or refuses it with PelmoException, exactly when a header text holds CR, LF or NUL or an
 // address is empty; the message it writes has CRLF line ends only, no line above RFC 5322
-// 2.1.1's 998 characters, no header field but its own, and GMime reads back its subject and
-// its parts.
+// 2.1.1's 998 characters, no header field but its own, a subject that reads back as it was
+// given, and the parts GMime finds.
 
 #include "FuzzSupport.h"
 
