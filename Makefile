@@ -26,13 +26,17 @@ test: deps
 	cd $(BUILD_TEST) && ctest --output-on-failure -j $(JOBS)
 
 # Builds the libFuzzer targets with clang and runs each for FUZZ_SECONDS, keeping its corpus in
-# $(BUILD_FUZZ)/corpus/<target> and anything it finds in $(BUILD_FUZZ)/artifacts/.
+# $(BUILD_FUZZ)/corpus/<target> (started from tests/data/fuzz/<target> on the first run) and
+# anything it finds in $(BUILD_FUZZ)/artifacts/.
 fuzz: deps
 	CC=clang CXX=clang++ cmake -S . -B $(BUILD_FUZZ) -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo \
 	  -DPELMO_FUZZ=ON -DPELMO_BUILD_TESTS=OFF
 	cmake --build $(BUILD_FUZZ) -j $(JOBS)
 	@set -e; for target in $(BUILD_FUZZ)/fuzzers/*; do \
 	  name=$$(basename $$target); \
+	  if [ ! -d $(BUILD_FUZZ)/corpus/$$name ] && [ -d tests/data/fuzz/$$name ]; then \
+	    mkdir -p $(BUILD_FUZZ)/corpus && cp -r tests/data/fuzz/$$name $(BUILD_FUZZ)/corpus/; \
+	  fi; \
 	  mkdir -p $(BUILD_FUZZ)/corpus/$$name $(BUILD_FUZZ)/artifacts; \
 	  echo "fuzz: $$name for $(FUZZ_SECONDS) s"; \
 	  $$target -max_total_time=$(FUZZ_SECONDS) -print_final_stats=1 \

@@ -165,6 +165,9 @@ std::optional<ImportedContact> contactOf(const Record& row, const QHash<Column, 
         const int index = columns.value(column, -1);
         return index < 0 ? QString() : row.fields.value(index).simplified();
     };
+    for (const Column name :
+         {Column::FirstName, Column::LastName, Column::FullName, Column::Groups})
+        ImportText::requireCleanName(field(name), row.line);
     ImportedContact contact;
     Person& person = contact.person;
     const QString first = field(Column::FirstName);

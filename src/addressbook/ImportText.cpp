@@ -42,6 +42,12 @@ void ImportText::requireAddress(const QString& address, int line) {
         throw ImportError(line, LocalizedString("\"%1\" is not an e-mail address").arg(address));
 }
 
+void ImportText::requireCleanName(const QString& name, int line) {
+    for (const QChar c : name)
+        if (c.category() == QChar::Other_Control)
+            throw ImportError(line, LocalizedString("a name cannot hold a control character"));
+}
+
 void ImportText::splitFullName(const QString& fullName, QString& first, QString& last) {
     const QString name = fullName.simplified();
     first.clear();

@@ -26,6 +26,11 @@ public:
     /** Throws ImportError for line unless the address is plausible. */
     static void requireAddress(const QString& address, int line);
     /**
+     * Throws ImportError for line when a person's or group's name holds a control character:
+     * the address book refuses such names, which would go into mail headers.
+     */
+    static void requireCleanName(const QString& name, int line);
+    /**
      * Splits a display name at its last space: "Ada King Lovelace" gives "Ada King" and
      * "Lovelace"; a single word is a first name and leaves last null.
      */

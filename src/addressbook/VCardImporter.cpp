@@ -214,8 +214,9 @@ QString unescaped(const QString& value, bool version21) {
 }
 
 // A blank part is a missing one.
-QString namePart(const QString& text) {
+QString cleanName(const QString& text, int line) {
     const QString part = text.simplified();
+    ImportText::requireCleanName(part, line);
     return part.isEmpty() ? QString() : part;
 }
 
@@ -241,13 +242,13 @@ struct Card {
         if (name == "VERSION")
             setVersion(QString::fromLatin1(property.value.trimmed()), line);
         else if (name == "N")
-            setName(decodedValue(property, line));
+            setName(decodedValue(property, line), line);
         else if (name == "FN")
-            formatted = namePart(unescaped(decodedValue(property, line), version21));
+            formatted = cleanName(unescaped(decodedValue(property, line), version21), line);
         else if (name == "EMAIL")
             addEmail(property, line);
         else if (name == "CATEGORIES")
-            addCategories(decodedValue(property, line));
+            addCategories(decodedValue(property, line), line);
         else if (name == "KIND" || name == "X-ADDRESSBOOKSERVER-KIND")
             isGroup = property.value.trimmed().compare("group", Qt::CaseInsensitive) == 0;
         else if (name == "UID")
@@ -267,10 +268,10 @@ struct Card {
 
     // N = family ";" given ";" additional ";" prefixes ";" suffixes (RFC 6350 6.2.2, RFC 2426
     // 3.1.2); since 3.0 a part may list several values separated by unescaped commas.
-    void setName(const QString& value) {
+    void setName(const QString& value, int line) {
         const QStringList parts = splitEscaped(value, QLatin1Char(';'), version21, true);
-        last = namePart(namePartValues(parts.value(0)));
-        first = namePart(namePartValues(parts.value(1)));
+        last = cleanName(namePartValues(parts.value(0)), line);
+        first = cleanName(namePartValues(parts.value(1)), line);
     }
 
     QString namePartValues(const QString& part) const {
@@ -300,9 +301,9 @@ struct Card {
         emails.append({address, rank});
     }
 
-    void addCategories(const QString& value) {
+    void addCategories(const QString& value, int line) {
         for (const QString& category : splitEscaped(value, QLatin1Char(','), version21)) {
-            const QString name = category.simplified();
+            const QString name = cleanName(category, line);
             if (!name.isEmpty() && !categories.contains(name, Qt::CaseInsensitive))
                 categories.append(name);
         }

@@ -10,43 +10,61 @@
 
 #include <iconv.h>
 
+#include <cerrno>
 #include <memory>
 
 namespace {
 
 // Whole-text conversion through iconv; null when the charset is unknown or a byte is invalid.
+// One byte may stand for several characters (TSCII gives up to twelve UTF-8 bytes), so the
+// output grows as needed; and a decoder may hold the last character back to combine it with
+// the next (windows-1258), so a call without input ends the conversion.
 QString convert(const QByteArray& bytes, const QByteArray& charset) {
     iconv_t cd = iconv_open("UTF-8", charset.constData());
     if (cd == reinterpret_cast<iconv_t>(-1))
         return {};
     std::unique_ptr<void, int (*)(iconv_t)> closer(cd, iconv_close);
     QByteArray out(bytes.size() * 4 + 4, Qt::Uninitialized);
+    qsizetype written = 0;
     char* in = const_cast<char*>(bytes.constData());
     size_t inLeft = static_cast<size_t>(bytes.size());
-    char* outPtr = out.data();
-    size_t outLeft = static_cast<size_t>(out.size());
-    if (iconv(cd, &in, &inLeft, &outPtr, &outLeft) == static_cast<size_t>(-1))
-        return {};
-    out.truncate(out.size() - static_cast<qsizetype>(outLeft));
+    for (bool ending = false;;) {
+        char* outPtr = out.data() + written;
+        size_t outLeft = static_cast<size_t>(out.size() - written);
+        const size_t result = ending ? iconv(cd, nullptr, nullptr, &outPtr, &outLeft)
+                                     : iconv(cd, &in, &inLeft, &outPtr, &outLeft);
+        written = outPtr - out.data();
+        if (result == static_cast<size_t>(-1)) {
+            if (errno != E2BIG)
+                return {};
+            out.resize(out.size() * 2);
+        } else if (ending) {
+            break;
+        } else {
+            ending = true;
+        }
+    }
+    out.truncate(written);
     return QString::fromUtf8(out);
 }
 
 // The charset named by the Content-Type header, else by the page's own meta element.
-QByteArray declaredCharset(const QNetworkReply& reply, const QByteArray& bytes) {
+QByteArray declaredCharset(const QString& contentType, const QByteArray& bytes) {
     static const QRegularExpression charset(
         QStringLiteral(R"(charset\s*=\s*["']?([A-Za-z0-9._:-]+))"),
         QRegularExpression::CaseInsensitiveOption);
-    const QString header = reply.header(QNetworkRequest::ContentTypeHeader).toString();
-    QRegularExpressionMatch match = charset.match(header);
+    QRegularExpressionMatch match = charset.match(contentType);
     if (!match.hasMatch())
         match = charset.match(QString::fromLatin1(bytes.left(4096)));
     return match.hasMatch() ? match.captured(1).toLatin1() : QByteArray();
 }
 
-QString decodePage(const QNetworkReply& reply, const QByteArray& bytes) {
+} // namespace
+
+QString DecodePage(const QByteArray& bytes, const QString& contentType) {
     QString text = DecodeUtf8Strictly(bytes);
     if (text.isNull()) {
-        const QByteArray declared = declaredCharset(reply, bytes);
+        const QByteArray declared = declaredCharset(contentType, bytes);
         if (!declared.isEmpty())
             text = convert(bytes, declared);
     }
@@ -54,8 +72,6 @@ QString decodePage(const QNetworkReply& reply, const QByteArray& bytes) {
         text = convert(bytes, "MACINTOSH");
     return text;
 }
-
-} // namespace
 
 PageDownload::PageDownload(QObject* parent)
     : QObject(parent), m_network(new QNetworkAccessManager(this)) {}
@@ -103,7 +119,8 @@ void PageDownload::replied() {
     const QByteArray bytes = reply->readAll();
     if (bytes.isEmpty())
         return finish({}, QStringLiteral("the page is empty"));
-    const QString text = decodePage(*reply, bytes);
+    const QString text =
+        DecodePage(bytes, reply->header(QNetworkRequest::ContentTypeHeader).toString());
     finish(text,
            text.isNull() ? QStringLiteral("the page's characters cannot be read") : QString());
 }

@@ -10,6 +10,13 @@ class QNetworkAccessManager;
 class QNetworkReply;
 
 /**
+ * A downloaded page's text: UTF-8 when the bytes are valid UTF-8, else the charset that
+ * contentType (the Content-Type header) or else the page's own meta element declares, else
+ * Mac OS Roman. Null when none of them reads the bytes.
+ */
+QString DecodePage(const QByteArray& bytes, const QString& contentType);
+
+/**
  * One web page fetched in the background, never from a cache, following redirects. Its text is
  * decoded as UTF-8 when the bytes are valid UTF-8, else in the charset the server or the page
  * declares, else as Mac OS Roman. finished() comes once, on the main loop, never from inside

@@ -93,6 +93,35 @@ QString withCrlfLineEnds(QString text) {
     return text.replace(QLatin1Char('\n'), QLatin1String("\r\n"));
 }
 
+// RFC 2047 2, 4.2, 5: the subject in "Q" encoded words of whole characters, each on a line of
+// its own that stays within 76 characters, the first one's "Subject: " included; as a raw
+// header value, folded with "\n ".
+QByteArray encodedSubject(const QString& text) {
+    constexpr qsizetype maxEncodedText = 76 - 9 - 12; // "Subject: ", "=?UTF-8?Q?" and "?="
+    QByteArray raw, word;
+    const auto endWord = [&] {
+        raw += " =?UTF-8?Q?" + word + "?=\n";
+        word.clear();
+    };
+    for (const char32_t codePoint : text.toUcs4()) {
+        QByteArray encoded;
+        for (const char byte : QString::fromUcs4(&codePoint, 1).toUtf8()) {
+            const auto c = static_cast<unsigned char>(byte);
+            if (isHiorLoAlpha(c) || isDig(c) || QByteArrayView("!*+-/").contains(byte))
+                encoded += byte;
+            else if (c == ' ')
+                encoded += '_';
+            else
+                encoded += '=' + QByteArray::number(c, 16).toUpper().rightJustified(2, '0');
+        }
+        if (word.size() + encoded.size() > maxEncodedText)
+            endWord();
+        word += encoded;
+    }
+    endWord();
+    return raw;
+}
+
 // HTML keeps every character as a numeric character reference; the controller's HTML already
 // holds them, a downloaded page may not. Other text can only mark the loss.
 QByteArray bodyBytes(const QString& text, const QString& mimeType, int characterSetIndex) {
@@ -159,6 +188,14 @@ void MessageAssembly::setSubject(const QString& subject) {
     // No charset given: GMime picks the smallest that holds the text for RFC 2047 words.
     g_mime_message_set_subject(
         message->mime.get(), headerText(subject, LocalizedString("subject")).constData(), nullptr);
+    // Text that looks like an encoded word must be encoded itself, or readers would decode it;
+    // GMime does, but folds inside its words when they are long, which breaks them for every
+    // reader. Such a subject is written here instead.
+    if (subject.contains(QLatin1String("=?")))
+        g_mime_header_set_raw_value(
+            g_mime_header_list_get_header(
+                g_mime_object_get_header_list(GMIME_OBJECT(message->mime.get())), "Subject"),
+            encodedSubject(subject).constData());
 }
 
 void MessageAssembly::setFrom(const QString& name, const QString& address) {

@@ -18,27 +18,8 @@
 
 namespace {
 
-// A reply this long without its last line is not SMTP (RFC 5321 4.5.3.1.5 allows 512 per
-// line); refusing it keeps a broken server from filling memory.
-constexpr qsizetype maxReplySize = 64 * 1024;
-
 bool isPositive(int code) {
     return code >= 200 && code < 300;
-}
-
-// RFC 5321 4.2: Reply-line = *( Reply-code "-" [ textstring ] CRLF )
-//                            Reply-code [ SP textstring ] CRLF
-bool isReplyLine(const QByteArray& line) {
-    if (line.size() < 3 ||
-        !std::all_of(line.begin(), line.begin() + 3, [](char c) { return c >= '0' && c <= '9'; }))
-        return false;
-    return line.size() == 3 || line[3] == ' ' || line[3] == '-';
-}
-
-QByteArray withoutLineEnd(QByteArray line) {
-    while (line.endsWith('\n') || line.endsWith('\r'))
-        line.chop(1);
-    return line;
 }
 
 // Lone CR and lone LF become CRLF, and the message ends with a line end: RFC 5321 2.3.8
@@ -208,7 +189,7 @@ void SmtpClient::startTLS() {
 }
 
 QStringList SmtpClient::supportedMechanisms() const {
-    return m_mechanisms;
+    return m_capabilities.mechanisms;
 }
 
 void SmtpClient::authenticate(const QString& user, const QString& password,
@@ -248,13 +229,13 @@ void SmtpClient::sendMessage() {
         return;
     if (const QString problem = envelopeProblem(); !problem.isEmpty())
         return refuseBeforeSending(problem);
-    if (m_sizeLimit > 0 && m_message.size() > m_sizeLimit)
+    if (m_capabilities.sizeLimit > 0 && m_message.size() > m_capabilities.sizeLimit)
         return refuseBeforeSending(
             tr("The message (%1 bytes) is larger than the %2 bytes the server accepts.")
                 .arg(m_message.size())
-                .arg(m_sizeLimit));
+                .arg(m_capabilities.sizeLimit));
     QByteArray command = "MAIL FROM:<" + m_sender.toUtf8() + '>';
-    if (m_sizeExtension) // RFC 1870 6: declare the size so the server can refuse it early
+    if (m_capabilities.size) // RFC 1870 6: declare the size so the server can refuse it early
         command += " SIZE=" + QByteArray::number(m_message.size());
     send(command);
     enter(State::MailFrom);
@@ -278,7 +259,7 @@ void SmtpClient::close() {
 }
 
 QByteArray SmtpClient::lastResponse() const {
-    return m_lastResponse;
+    return m_reply.raw;
 }
 
 QString SmtpClient::errorString() const {
@@ -429,23 +410,32 @@ bool SmtpClient::readsReplies() const {
     }
 }
 
+// Bytes are taken from the socket only in states that read replies: during a TLS handshake
+// they are not yet the conversation's.
 void SmtpClient::readReplies() {
-    while (readsReplies() && m_socket->canReadLine()) {
-        const QByteArray raw = m_socket->readLine();
-        const QByteArray line = withoutLineEnd(raw);
-        m_pendingReply += raw;
-        if (!isReplyLine(line))
-            return finish(&SmtpSession::connectionLost,
-                          tr("The server %1 sent a malformed reply: %2")
-                              .arg(m_host, printable(QString::fromUtf8(line))));
-        if (line.size() > 3 && line[3] == '-')
-            continue; // RFC 5321 4.2.1: more lines of this reply follow
-        m_lastResponse = std::exchange(m_pendingReply, {});
-        handleReply(line.left(3).toInt());
+    if (!readsReplies())
+        return;
+    m_replies.feed(m_socket->readAll());
+    while (readsReplies()) {
+        std::optional<SmtpReply> reply = m_replies.next();
+        if (!reply)
+            break;
+        m_reply = std::move(*reply);
+        handleReply(m_reply.code);
     }
-    if (readsReplies() && m_pendingReply.size() + m_socket->bytesAvailable() > maxReplySize)
-        finish(&SmtpSession::connectionLost,
-               tr("The server %1 sent an overlong reply.").arg(m_host));
+    if (!readsReplies())
+        return;
+    switch (m_replies.error()) {
+    case SmtpReplyReader::Error::None:
+        return;
+    case SmtpReplyReader::Error::Malformed:
+        return finish(&SmtpSession::connectionLost,
+                      tr("The server %1 sent a malformed reply: %2")
+                          .arg(m_host, printable(QString::fromUtf8(m_replies.malformedLine()))));
+    case SmtpReplyReader::Error::Overlong:
+        return finish(&SmtpSession::connectionLost,
+                      tr("The server %1 sent an overlong reply.").arg(m_host));
+    }
 }
 
 void SmtpClient::handleReply(int code) {
@@ -491,16 +481,14 @@ void SmtpClient::onGreeting(int code) {
 
 void SmtpClient::sendEhlo() {
     // RFC 3207 4.2: what the server announced before TLS is forgotten.
-    m_mechanisms.clear();
-    m_sizeExtension = false;
-    m_sizeLimit = 0;
+    m_capabilities = {};
     send("EHLO " + ehloDomain());
     enter(State::Ehlo);
 }
 
 void SmtpClient::onEhlo(int code) {
     if (isPositive(code)) {
-        parseCapabilities();
+        m_capabilities = SmtpCapabilities::fromEhlo(m_reply);
         enter(State::Ready);
         return notify(&SmtpSession::serviceInitialized);
     }
@@ -521,33 +509,11 @@ void SmtpClient::onHelo(int code) {
     notify(&SmtpSession::serviceInitialized);
 }
 
-// RFC 5321 4.1.1.1: every line after the first of a 250 EHLO reply is "keyword [params]".
-void SmtpClient::parseCapabilities() {
-    // Some servers still write the pre-standard "AUTH=LOGIN PLAIN".
-    static const QRegularExpression separators(QStringLiteral("[ =]"));
-    const QList<QByteArray> lines = m_lastResponse.split('\n');
-    for (qsizetype i = 1; i < lines.size(); ++i) {
-        const QString text = QString::fromUtf8(withoutLineEnd(lines[i]).mid(4)).toUpper();
-        const QStringList words = text.split(separators, Qt::SkipEmptyParts);
-        if (words.isEmpty())
-            continue;
-        if (words[0] == QLatin1String("AUTH")) {
-            for (const QString& mechanism : words.mid(1))
-                if (!m_mechanisms.contains(mechanism))
-                    m_mechanisms += mechanism;
-        } else if (words[0] == QLatin1String("SIZE")) {
-            // RFC 1870 4: SIZE without a number, or 0, means no fixed limit.
-            m_sizeExtension = true;
-            m_sizeLimit = words.size() > 1 ? words[1].toLongLong() : 0;
-        }
-    }
-}
-
 void SmtpClient::onStartTLS(int code) {
     if (code != 220)
         return failTLS(tr("The server %1 refused STARTTLS: %2").arg(m_host, replyText()));
     // RFC 3207 5: anything the server sent after its 220 and before TLS cannot be trusted.
-    m_socket->readAll();
+    m_replies.clear();
     startEncryption(State::TLSHandshake);
 }
 
@@ -585,10 +551,13 @@ void SmtpClient::answerChallenge() {
     enter(State::AuthCancelled);
 }
 
-// RFC 2195 2: base64 of "user SP hex(HMAC-MD5(password, challenge))".
+// RFC 2195 2: base64 of "user SP hex(HMAC-MD5(password, challenge))". The challenge is the
+// text of a one-line 334 (RFC 4954 4).
 QByteArray SmtpClient::cramMd5Response() const {
-    const auto decoded = QByteArray::fromBase64Encoding(
-        withoutLineEnd(m_lastResponse).mid(4).trimmed(), QByteArray::AbortOnBase64DecodingErrors);
+    if (m_reply.lines.size() != 1)
+        return {};
+    const auto decoded = QByteArray::fromBase64Encoding(m_reply.lines[0].trimmed(),
+                                                        QByteArray::AbortOnBase64DecodingErrors);
     if (!decoded || decoded.decoded.isEmpty())
         return {};
     const QByteArray digest =
@@ -598,7 +567,7 @@ QByteArray SmtpClient::cramMd5Response() const {
 }
 
 void SmtpClient::failAuthentication(const QString& why) {
-    m_lastResponse.clear();
+    m_reply = {};
     m_errorString = why;
     forgetCredentials();
     notify(&SmtpSession::authenticationFailed);
@@ -619,7 +588,7 @@ QString SmtpClient::envelopeProblem() const {
 }
 
 void SmtpClient::refuseBeforeSending(const QString& why) {
-    m_lastResponse.clear();
+    m_reply = {};
     m_errorString = why;
     notify(&SmtpSession::messageNotSent);
 }
@@ -697,5 +666,5 @@ QByteArray SmtpClient::ehloDomain() const {
 }
 
 QString SmtpClient::replyText() const {
-    return QString::fromUtf8(m_lastResponse).simplified();
+    return QString::fromUtf8(m_reply.raw).simplified();
 }

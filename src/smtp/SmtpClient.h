@@ -1,5 +1,6 @@
 #pragma once
 
+#include "smtp/SmtpReply.h"
 #include "smtp/SmtpSession.h"
 
 #include <QByteArray>
@@ -133,7 +134,6 @@ private:
     void sendEhlo();
     void onEhlo(int code);
     void onHelo(int code);
-    void parseCapabilities();
     void onStartTLS(int code);
     void startEncryption(State handshake);
     void onAuthReply(int code);
@@ -161,14 +161,12 @@ private:
     bool m_implicitTLS;
     State m_state = State::Unconnected;
 
-    QByteArray m_pendingReply;
-    QByteArray m_lastResponse;
+    SmtpReplyReader m_replies;
+    SmtpReply m_reply; // the last one: lastResponse()
     QString m_errorString;
     QList<QSslError> m_sslErrors;
 
-    QStringList m_mechanisms;
-    bool m_sizeExtension = false;
-    qint64 m_sizeLimit = 0;
+    SmtpCapabilities m_capabilities;
 
     QByteArray m_user;
     QByteArray m_password;

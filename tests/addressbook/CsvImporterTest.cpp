@@ -84,6 +84,9 @@ INSTANTIATE_TEST_SUITE_P(
         BadCase{"BadAddressAfterAMultiLineField",
                 "first name,email\n\"Ada\nAugusta\",ada@example.org\nAlan,alan(at)example.org\n", 4,
                 "line 4: \"alan(at)example.org\" is not an e-mail address"},
+        BadCase{"ControlCharacterInAGroup",
+                "first name,email,groups\nMarie,marie@example.org,Friends\x12\n", 2,
+                "line 2: a name cannot hold a control character"},
         BadCase{"EmptyFile", "", 0, "the file is empty"}),
     RowName());
 

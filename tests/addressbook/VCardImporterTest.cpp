@@ -136,6 +136,9 @@ INSTANTIATE_TEST_SUITE_P(
         BadCase{"FoldedLineCountsFromItsStart",
                 "BEGIN:VCARD\nVERSION:3.0\nFN:A\nEMAIL:not\n an-address\nEND:VCARD\n", 4,
                 "line 4: \"notan-address\" is not an e-mail address"},
+        BadCase{"ControlCharacterInAName",
+                "BEGIN:VCARD\nVERSION:3.0\nN:Lovelace;Ada\x1e\x1e;;;\nEND:VCARD\n", 3,
+                "line 3: a name cannot hold a control character"},
         BadCase{"EmptyFile", "", 0, "the file holds no vCard"}),
     RowName());
 
