@@ -5,13 +5,21 @@
 
 #include "relink/Hrefs.h"
 
+#include <string>
+#include <string_view>
+#include <vector>
+
 namespace reference {
 
-void collect_all_urls(const CText& page, CList<CString256>& urls);
-void classic_extract_hrefs(const CString256& pageURL, ip_protocols scheme, const CText& page,
-                           HrefMap& map);
-void extract_hrefs(const CString256& pageURL, ip_protocols scheme, const CText& page, HrefMap& map);
-void ReplaceMappedURLs(CText& page, const HrefMap& map);
 void relink(const CString256& pageURL, CText& page);
+
+/** The page relinked, the suffix scan's words and the href map, by either algorithm. */
+std::vector<std::string> outcome(const CString256& pageURL, std::string_view page, bool plain);
+
+CText textOf(std::string_view bytes);
+std::string bytesOf(const CText& text);
+/** The list's texts, or the map's entries as "key -> value", appended to out. */
+std::vector<std::string> lines(const CList<CString256>& list, std::vector<std::string> out = {});
+std::vector<std::string> lines(const HrefMap& map, std::vector<std::string> out = {});
 
 } // namespace reference
