@@ -1,7 +1,6 @@
 #pragma once
 
 #include <QDesktopServices>
-#include <QList>
 #include <QObject>
 #include <QUrl>
 
@@ -11,9 +10,8 @@ class DesktopStandIn : public QObject {
     Q_OBJECT
 
 public:
-    DesktopStandIn() { QDesktopServices::setUrlHandler(QStringLiteral("file"), this, "open"); }
-    ~DesktopStandIn() override { QDesktopServices::unsetUrlHandler(QStringLiteral("file")); }
-
+    DesktopStandIn() { QDesktopServices::setUrlHandler("file", this, "open"); }
+    ~DesktopStandIn() override { QDesktopServices::unsetUrlHandler("file"); }
     QList<QUrl> opened;
 
 public Q_SLOTS:

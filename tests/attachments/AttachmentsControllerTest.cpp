@@ -3,231 +3,100 @@
 #include "DesktopStandIn.h"
 #include "RowName.h"
 
-#include <QDir>
-#include <QFile>
 #include <QMimeData>
-#include <QTemporaryDir>
 #include <QUrl>
-#include <gtest/gtest.h>
 
 namespace {
 
 using Controller = AttachmentsController;
 
-// A drag as the table would hand it over: real QMimeData, read by the controller.
-Controller::Drag fileDrag(const QStringList& paths) {
-    QMimeData data;
-    QList<QUrl> urls;
-    for (const QString& path : paths)
-        urls += QUrl::fromLocalFile(path);
-    data.setUrls(urls);
-    return Controller::readDrag(data);
-}
-
-Controller::Drag rowDrag(const QList<int>& rows) {
-    return Controller::readDrag(*Controller::rowDragData(rows));
-}
-
+// The list /a /b /c /d, put in by addFiles; the changes it tells of are counted from then on.
 class Attachments : public ::testing::Test {
 protected:
     Attachments() {
-        QObject::connect(&controller, &Controller::attachmentsChanged, [this] { ++changes; });
+        list.addFiles({"/a", "/b", "/c", "/d"});
+        QObject::connect(&list, &Controller::attachmentsChanged, [this] { ++changes; });
     }
-
-    // One file at a time at the end, so that the list is in the given order.
-    void fill(const QStringList& paths) {
-        for (const QString& path : paths)
-            ASSERT_TRUE(controller.acceptDrop(fileDrag({path}), -1));
-        changes = 0;
-    }
-
-    Controller controller;
+    QString shown() const { return list.getAttachments().join(' '); }
+    Controller list;
     int changes = 0;
 };
 
-TEST(AttachmentsDrag, RowDragCarriesTheRowsAsAnIndexSet) {
-    const std::unique_ptr<QMimeData> data = Controller::rowDragData({3, 1, 3});
-    EXPECT_EQ(Controller::privateDragType, QStringLiteral("MyPrivateTableViewDataType"));
-    EXPECT_TRUE(data->hasFormat(QStringLiteral("MyPrivateTableViewDataType")));
-    const Controller::Drag drag = Controller::readDrag(*data);
-    EXPECT_TRUE(drag.isRowDrag);
-    EXPECT_EQ(drag.rows, (QList<int>{1, 3}));
-    EXPECT_TRUE(drag.files.isEmpty());
-    EXPECT_FALSE(drag.firstFile());
-}
-
-TEST(AttachmentsDrag, FileDragKeepsLocalFilesInOrder) {
-    QMimeData data;
-    data.setUrls({QUrl::fromLocalFile(QStringLiteral("/tmp/b b.txt")),
-                  QUrl(QStringLiteral("https://example.org/page.html")),
-                  QUrl::fromLocalFile(QStringLiteral("/tmp/a.txt"))});
-    const Controller::Drag drag = Controller::readDrag(data);
-    EXPECT_FALSE(drag.isRowDrag);
-    EXPECT_EQ(drag.files,
-              (QStringList{QStringLiteral("/tmp/b b.txt"), QStringLiteral("/tmp/a.txt")}));
-    EXPECT_EQ(drag.firstFile(), QStringLiteral("/tmp/b b.txt"));
-}
-
-TEST(AttachmentsDrag, PrivateTypeComesFirst) {
-    const std::unique_ptr<QMimeData> data = Controller::rowDragData({2});
-    data->setUrls({QUrl::fromLocalFile(QStringLiteral("/tmp/a.txt"))});
-    const Controller::Drag drag = Controller::readDrag(*data);
-    EXPECT_TRUE(drag.isRowDrag);
-    EXPECT_EQ(drag.rows, QList<int>{2});
-}
-
-struct VerdictRow {
+// A drag as the table hands it over, judged and then dropped at insertion row at: rows in the
+// private type, file URLs ("/" is a folder, the others do not exist), or both; junk is private
+// data that is no index set.
+struct DropRow {
     std::string name;
-    std::optional<QString> firstFile; // relative to a folder holding "file.txt" and "folder"
-    bool dropOnRow;
-    unsigned expected;
-
-    // Names the row in test listings instead of a byte dump.
-    friend void PrintTo(const VerdictRow& row, std::ostream* out) { *out << row.name; }
+    QList<int> rows;
+    QStringList urls;
+    int at;
+    QString expected;
+    bool taken, onRow = false, junk = false;
+    friend void PrintTo(const DropRow& row, std::ostream* out) { *out << row.name; }
 };
 
-class DropVerdict : public ::testing::TestWithParam<VerdictRow> {};
+class Drop : public Attachments, public ::testing::WithParamInterface<DropRow> {};
 
-TEST_P(DropVerdict, FollowsTheFirstFile) {
-    QTemporaryDir dir;
-    QFile file(dir.filePath(QStringLiteral("file.txt")));
-    ASSERT_TRUE(file.open(QIODevice::WriteOnly));
-    ASSERT_TRUE(QDir(dir.path()).mkdir(QStringLiteral("folder")));
-    std::optional<QString> path;
-    if (GetParam().firstFile)
-        path = dir.filePath(*GetParam().firstFile);
-    EXPECT_EQ(Controller::validateDrop(path, GetParam().dropOnRow), GetParam().expected);
+TEST_P(Drop, Lands) {
+    const DropRow& row = GetParam();
+    auto data =
+        row.rows.isEmpty() ? std::make_unique<QMimeData>() : Controller::rowDragData(row.rows);
+    if (row.junk)
+        data->setData(Controller::privateDragType, "not an index set");
+    data->setUrls(QUrl::fromStringList(row.urls));
+    const Controller::Drag drag = Controller::readDrag(*data);
+    EXPECT_EQ(Controller::validateDrop(drag.firstFile(), row.onRow) != 0 &&
+                  list.acceptDrop(drag, row.at),
+              row.taken);
+    EXPECT_EQ(shown(), row.expected);
+    EXPECT_EQ(changes, (shown() == "/a /b /c /d" ? 0 : 1));
 }
 
 INSTANTIATE_TEST_SUITE_P(
-    Rows, DropVerdict,
+    Rows, Drop,
     ::testing::Values(
-        VerdictRow{"file_between_rows", QStringLiteral("file.txt"), false,
-                   Controller::dragOperationEvery},
-        VerdictRow{"file_onto_a_row", QStringLiteral("file.txt"), true,
-                   Controller::dragOperationNone},
-        VerdictRow{"row_drag_between_rows", std::nullopt, false, Controller::dragOperationEvery},
-        VerdictRow{"row_drag_onto_a_row", std::nullopt, true, Controller::dragOperationNone},
-        VerdictRow{"folder", QStringLiteral("folder"), false, Controller::dragOperationNone},
-        VerdictRow{"missing_file", QStringLiteral("gone.txt"), false,
-                   Controller::dragOperationEvery}),
+        // Each file goes in at the same index, so several land in reverse order.
+        DropRow{"files", {}, {"file:///x", "file:///y"}, 1, "/a /y /x /b /c /d", true},
+        DropRow{"below_last", {}, {"file:///x"}, -1, "/a /b /c /d /x", true},
+        DropRow{"beyond_end", {}, {"file:///x"}, 9, "/a /b /c /d /x", true},
+        DropRow{"duplicate", {}, {"file:///a"}, 0, "/a /a /b /c /d", true},
+        DropRow{"web_left_out", {}, {"https://e.org/p", "file:///x"}, 4, "/a /b /c /d /x", true},
+        DropRow{"web_only", {}, {"https://e.org/p"}, 0, "/a /b /c /d", false},
+        // Only the first file is judged: a folder after it comes along.
+        DropRow{"folder_first", {}, {"file:///", "file:///x"}, 0, "/a /b /c /d", false},
+        DropRow{"folder_second", {}, {"file:///x", "file:///"}, 0, "/ /x /a /b /c /d", true},
+        DropRow{"file_onto_row", {}, {"file:///x"}, 0, "/a /b /c /d", false, true},
+        // A row lands above the drop point; of several rows only the first moves.
+        DropRow{"down", {0}, {}, 3, "/b /c /a /d", true},
+        DropRow{"up", {2}, {}, 0, "/c /a /b /d", true},
+        DropRow{"first_of_two", {3, 1}, {}, 0, "/b /a /c /d", true},
+        DropRow{"to_end", {0}, {}, 4, "/b /c /d /a", true},
+        DropRow{"row_below_last", {0}, {}, -1, "/b /c /d /a", true},
+        DropRow{"own_place", {1}, {}, 1, "/a /b /c /d", true},
+        DropRow{"after_itself", {1}, {}, 2, "/a /b /c /d", true},
+        DropRow{"stale_row", {7}, {}, 0, "/a /b /c /d", true},
+        DropRow{"row_onto_row", {0}, {}, 3, "/a /b /c /d", false, true},
+        DropRow{"rows_before_urls", {2}, {"file:///x"}, 0, "/c /a /b /d", true},
+        DropRow{"junk", {}, {}, 0, "/a /b /c /d", false, false, true}),
     RowName());
 
-TEST(AttachmentsDrag, OnlyTheFirstFileOfAMultiFileDragIsExamined) {
-    QTemporaryDir dir;
-    const QString folder = dir.filePath(QStringLiteral("folder"));
-    const QString file = dir.filePath(QStringLiteral("file.txt"));
-    ASSERT_TRUE(QDir().mkdir(folder));
-    QFile(file).open(QIODevice::WriteOnly);
-
-    const Controller::Drag folderFirst = fileDrag({folder, file});
-    EXPECT_EQ(Controller::validateDrop(folderFirst.firstFile(), false),
-              Controller::dragOperationNone);
-
-    const Controller::Drag folderSecond = fileDrag({file, folder});
-    EXPECT_EQ(Controller::validateDrop(folderSecond.firstFile(), false),
-              Controller::dragOperationEvery);
-    Controller controller;
-    EXPECT_TRUE(controller.acceptDrop(folderSecond, 0));
-    EXPECT_EQ(controller.getAttachments(), (QStringList{folder, file}));
+TEST_F(Attachments, DeleteTakesTheSelectedRowsOrAll) {
+    list.deleteButtonClicked({2, 0});
+    EXPECT_EQ(shown(), "/b /d");
+    list.deleteButtonClicked({1, 1, 9, -1});
+    EXPECT_EQ(shown(), "/b");
+    list.deleteButtonClicked({});
+    EXPECT_EQ(shown(), "");
+    EXPECT_EQ(changes, 3);
 }
 
-struct MoveRow {
-    std::string name;
-    QList<int> dragged;
-    int row;
-    QStringList expected;
-
-    // Names the row in test listings instead of a byte dump.
-    friend void PrintTo(const MoveRow& row, std::ostream* out) { *out << row.name; }
-};
-
-class RowMove : public Attachments, public ::testing::WithParamInterface<MoveRow> {};
-
-TEST_P(RowMove, MovesOnlyTheFirstDraggedRow) {
-    const QStringList start = {"a", "b", "c", "d"};
-    fill(start);
-    EXPECT_TRUE(controller.acceptDrop(rowDrag(GetParam().dragged), GetParam().row));
-    EXPECT_EQ(controller.getAttachments(), GetParam().expected);
-    EXPECT_EQ(changes, GetParam().expected == start ? 0 : 1);
-}
-
-INSTANTIATE_TEST_SUITE_P(
-    Rows, RowMove,
-    ::testing::Values(MoveRow{"row_0_to_point_3", {0}, 3, {"b", "c", "a", "d"}},
-                      MoveRow{"row_2_to_point_0", {2}, 0, {"c", "a", "b", "d"}},
-                      MoveRow{"rows_1_and_3_move_only_row_1", {3, 1}, 0, {"b", "a", "c", "d"}},
-                      MoveRow{"row_0_to_the_end", {0}, 4, {"b", "c", "d", "a"}},
-                      MoveRow{"row_0_below_the_last_row", {0}, -1, {"b", "c", "d", "a"}},
-                      MoveRow{"onto_its_own_place", {1}, 1, {"a", "b", "c", "d"}},
-                      MoveRow{"just_after_itself", {1}, 2, {"a", "b", "c", "d"}},
-                      MoveRow{"stale_row", {7}, 0, {"a", "b", "c", "d"}}),
-    RowName());
-
-TEST_F(Attachments, UnreadableRowDragIsRefused) {
-    fill({"a", "b"});
-    QMimeData data;
-    data.setData(Controller::privateDragType, "not an index set");
-    const Controller::Drag drag = Controller::readDrag(data);
-    EXPECT_TRUE(drag.isRowDrag);
-    EXPECT_TRUE(drag.rows.isEmpty());
-    EXPECT_FALSE(controller.acceptDrop(drag, 0));
-    EXPECT_EQ(controller.getAttachments(), (QStringList{"a", "b"}));
-    EXPECT_EQ(changes, 0);
-}
-
-TEST_F(Attachments, DroppedFilesLandReversedAtTheDropPoint) {
-    fill({"/x", "/y"});
-    EXPECT_TRUE(controller.acceptDrop(fileDrag({"/a", "/b", "/c"}), 1));
-    EXPECT_EQ(controller.getAttachments(), (QStringList{"/x", "/c", "/b", "/a", "/y"}));
-    EXPECT_EQ(changes, 1);
-}
-
-TEST_F(Attachments, DuplicatesAreNotFiltered) {
-    fill({"/x"});
-    EXPECT_TRUE(controller.acceptDrop(fileDrag({"/x"}), 0));
-    EXPECT_EQ(controller.getAttachments(), (QStringList{"/x", "/x"}));
-}
-
-TEST_F(Attachments, DropWithoutFilesInsertsNothing) {
-    fill({"/x"});
-    QMimeData data;
-    data.setUrls({QUrl(QStringLiteral("https://example.org/"))});
-    EXPECT_FALSE(controller.acceptDrop(Controller::readDrag(data), 0));
-    EXPECT_EQ(controller.getAttachments(), QStringList{"/x"});
-    EXPECT_EQ(changes, 0);
-}
-
-TEST_F(Attachments, DeleteRemovesTheSelectedRows) {
-    fill({"a", "b", "c", "d"});
-    controller.deleteButtonClicked({2, 0});
-    EXPECT_EQ(controller.getAttachments(), (QStringList{"b", "d"}));
-    EXPECT_EQ(changes, 1);
-    controller.deleteButtonClicked({1, 1, 9, -1});
-    EXPECT_EQ(controller.getAttachments(), QStringList{"b"});
-}
-
-TEST_F(Attachments, DeleteWithNoSelectionEmptiesTheList) {
-    fill({"a", "b", "c"});
-    controller.deleteButtonClicked({});
-    EXPECT_TRUE(controller.getAttachments().isEmpty());
-    EXPECT_EQ(changes, 1);
-}
-
-TEST_F(Attachments, OpenHandsTheFileToTheDesktop) {
-    fill({"/home/ada/a.pdf", "/home/ada/b c.pdf"});
+TEST_F(Attachments, OpenHandsARowToTheDesktop) {
+    list.addFiles({"/home/ada/b c.pdf"});
     DesktopStandIn desktop;
-    EXPECT_TRUE(controller.openAttachment(1));
-    EXPECT_EQ(desktop.opened,
-              QList<QUrl>{QUrl::fromLocalFile(QStringLiteral("/home/ada/b c.pdf"))});
-}
-
-TEST_F(Attachments, OpenWithoutARowIsIgnored) {
-    fill({"/home/ada/a.pdf"});
-    DesktopStandIn desktop;
-    EXPECT_FALSE(controller.openAttachment(-1));
-    EXPECT_FALSE(controller.openAttachment(1));
-    EXPECT_TRUE(desktop.opened.isEmpty());
+    EXPECT_FALSE(list.openAttachment(-1)); // no selection
+    EXPECT_FALSE(list.openAttachment(5));
+    EXPECT_TRUE(list.openAttachment(4));
+    EXPECT_EQ(desktop.opened, QList<QUrl>{QUrl::fromLocalFile("/home/ada/b c.pdf")});
 }
 
 } // namespace
