@@ -4,8 +4,7 @@
 #include <QObject>
 #include <QUrl>
 
-// Stands in for the desktop while it lives: QDesktopServices hands file URLs to it instead of
-// opening them.
+// While it lives, file URLs that QDesktopServices would open are handed to it instead.
 class DesktopStandIn : public QObject {
     Q_OBJECT
 

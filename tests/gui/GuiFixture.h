@@ -26,14 +26,7 @@ protected:
         window->show();
         ASSERT_TRUE(QTest::qWaitForWindowExposed(window.get()));
     }
-    void TearDown() override {
-        window.reset();
-        pelmo.reset();
-        // Message boxes and dialogs that deleted themselves later go now.
-        QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
-    }
     PeoplePicker& picker() const { return window->peoplePicker(); }
-    /** The child of parent (the main window by default) with that object name. */
     template <class T>
     T* child(const char* name, QObject* parent = nullptr) const {
         T* found = (parent ? parent : window.get())->findChild<T*>(QLatin1String(name));
@@ -45,14 +38,12 @@ protected:
     static T* asked() {
         return qobject_cast<T*>(QApplication::activeModalWidget());
     }
-    /** Clicks the row of list showing text, the way a user does. */
     static void clickRow(QListWidget* list, const QString& text, Qt::KeyboardModifiers keys = {}) {
         const QList<QListWidgetItem*> found = list->findItems(text, Qt::MatchExactly);
         ASSERT_EQ(found.size(), 1) << text.toStdString();
         QTest::mouseClick(list->viewport(), Qt::LeftButton, keys,
                           list->visualItemRect(found[0]).center());
     }
-    /** Adds the person "first last <first@example.org>" to the book, in group. */
     qint64 addPerson(const QString& first, const QString& last, const QString& group) {
         const qint64 id = book->addPerson({0, first, last, {first.toLower() + "@example.org"}, 0});
         const std::optional<Group> known = book->groupNamed(group);
@@ -64,6 +55,6 @@ protected:
     FakeKeyring keyring;
     MailSettings mailSettings;
     std::unique_ptr<AddressBook> book;
-    std::unique_ptr<MainWindow> window;
     std::unique_ptr<PelmoController> pelmo;
+    std::unique_ptr<MainWindow> window; // goes first, with its dialogs, then the controller
 };

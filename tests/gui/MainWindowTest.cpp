@@ -1,7 +1,5 @@
 #include "GuiFixture.h"
 #include "QtTestMain.h"
-#include "controller/RecipientSelection.h"
-#include "controller/ScriptedSession.h"
 #include "e2e/E2eSupport.h"
 #include "gui/PreferencesDialog.h"
 #include "gui/RecipientsWindow.h"
@@ -14,14 +12,15 @@
 
 namespace {
 
-// A mailing run from the window, Ann typed as the recipient: the widgets pressed as a user
-// presses them, the server's part played by scripted sessions or by aiosmtpd.
+// A mailing run from the window to aiosmtpd, Ann typed as the recipient: the widgets pressed
+// as a user presses them.
 class WindowRun : public GuiFixture {
 protected:
     void SetUp() override {
         GuiFixture::SetUp();
         set("senderName", "Me");
         set("senderEmail", "me@example.org");
+        set("serverPort", server.port());
         set("selectedContentType", 1);
         pelmo->message()->setPlainText("Hello {toName}");
         QObject::connect(pelmo.get(), &PelmoController::runSettled, [this] { idle = true; });
@@ -34,68 +33,58 @@ protected:
         ASSERT_TRUE(!settle || waitUntil([this] { return idle; })) << "the run never settled";
         QCoreApplication::processEvents();
     }
-    // The send row (its button and its bar as "value of maximum") and the recipients table.
+    // The send button, the bar as "value of maximum" (-1 when hidden), the recipients table.
     QString shown() const {
-        const QAbstractItemModel* model = window->recipientsWindow().table().model();
-        QStringList rows;
-        for (int row = 0; row < model->rowCount(); ++row)
-            rows << model->headerData(row, Qt::Vertical).toString() + ' ' +
-                        model->index(row, 0).data().toString();
         const auto* bar = child<QProgressBar>("spinner");
-        return QString("%1 %2 of %3 / ")
-                   .arg(child<QPushButton>("sendButton")->text())
-                   .arg(bar->isHidden() ? -1 : bar->value())
-                   .arg(bar->maximum()) +
-               rows.join(", ");
+        QString text =
+            child<QPushButton>("sendButton")->text() +
+            QString(" %1 of %2 /").arg(bar->isHidden() ? -1 : bar->value()).arg(bar->maximum());
+        const QAbstractItemModel* model = window->recipientsWindow().table().model();
+        for (int row = 0; row < model->rowCount(); ++row)
+            text += ' ' + model->headerData(row, Qt::Vertical).toString() + ' ' +
+                    model->index(row, 0).data().toString();
+        return text;
     }
     QString status() const { return child<QLabel>("status")->text(); }
+    ServerProcess server{PELMO_TEST_DIR "/smtp/smtp_server.py", {}};
     bool idle = false;
 };
 
-TEST_F(WindowRun, SendMailsTheTypedRecipientThroughARealServer) {
+TEST_F(WindowRun, SendMailsTheTypedRecipient) {
     press();
     // A setting that fails stops the run before it starts and frees the button.
     EXPECT_TRUE(status().startsWith("Error (NoServer): ")) << status().toStdString();
-    EXPECT_EQ(shown(), "Send -1 of 1 / ");
-    ServerProcess server(PELMO_TEST_DIR "/smtp/smtp_server.py", {});
+    EXPECT_EQ(shown(), "Send -1 of 1 /");
     set("serverAddress", "127.0.0.1");
-    set("serverPort", server.port());
     QTest::keyClicks(child<QLineEdit>("subject"), "News");
     press(false);
     // One message, not a list: the bar is busy while it goes, and hidden after.
-    EXPECT_EQ(shown(), "Stop 0 of 0 / ");
+    EXPECT_EQ(shown(), "Stop 0 of 0 /");
     ASSERT_TRUE(waitUntil([this] { return idle; }));
     EXPECT_TRUE(status().startsWith("[Mailing completed at ")) << status().toStdString();
-    const QList<QByteArray> records = server.records();
-    ASSERT_EQ(records.size(), 1);
-    const ReceivedMessage message = parseMessage(messageOf(records[0]));
+    const ReceivedMessage message = parseMessage(messageOf(server.records().value(0)));
     EXPECT_EQ(message.to + " / " + message.subject + " / " + message.parts.value(0).content,
               "Ann <ann@example.org> / News / Hello Ann");
     EXPECT_TRUE(window->recipientsWindow().isVisible());
     EXPECT_EQ(shown(), "Send -1 of 1 / 1 ann@example.org");
     QTest::mouseClick(child<QPushButton>("resetButton", &window->recipientsWindow()),
                       Qt::LeftButton);
-    EXPECT_EQ(shown(), "Send -1 of 1 / ");
+    EXPECT_EQ(shown(), "Send -1 of 1 /");
 }
 
 TEST_F(WindowRun, AGroupCountsOnTheBarAndStopLetsTheCurrentCopyFinish) {
-    QStringList calls;
-    set("serverAddress", "mail.example.org");
-    set("serverPort", 25);
-    pelmo->setSessionFactory(
-        [&calls](const QString&, int) -> SmtpSession* { return new ScriptedSession({}, calls); });
+    set("serverAddress", "127.0.0.1");
     for (const char* first : {"Ann", "Bob", "Cy"})
         addPerson(first, "Test", "Club");
     picker().reload();
     picker().show();
     clickRow(child<QListWidget>("groups", &picker()), "Club");
     press(false);
-    EXPECT_EQ(shown(), "Stop 1 of 3 / ");
+    EXPECT_EQ(shown(), "Stop 1 of 3 /");
     press(); // Stop while Ann's copy is on its way
     EXPECT_EQ(shown(), "Send 1 of 3 / 1 ann@example.org");
-    // The next Send goes on with those not yet mailed.
-    press();
-    EXPECT_EQ(shown(), "Send -1 of 1 / 1 ann@example.org, 2 bob@example.org, 3 cy@example.org");
+    press(); // goes on with those not yet mailed
+    EXPECT_EQ(shown(), "Send -1 of 1 / 1 ann@example.org 2 bob@example.org 3 cy@example.org");
 }
 
 TEST_F(GuiFixture, BoldFormatsTheSelectionOrWhatIsTypedNext) {
@@ -109,30 +98,16 @@ TEST_F(GuiFixture, BoldFormatsTheSelectionOrWhatIsTypedNext) {
     QTest::keyClicks(editor, "Saturday");
     bold->trigger();
     QTest::keyClicks(editor, " at");
-    // The editor writes into the controller's own message.
     EXPECT_EQ(pelmo->message()->toMarkdown(), "on **Saturday** at\n\n");
     editor->selectAll();
     bold->trigger();
     EXPECT_EQ(pelmo->message()->toMarkdown(), "**on Saturday at**\n\n");
-    EXPECT_TRUE(bold->isChecked());
-}
-
-// The controller drops a chosen group when the user edits To or Name, not when it fills them.
-TEST_F(GuiFixture, OnlyTheUsersEditsOfToAndNameDropAGroup) {
-    for (const char* field : {"subject", "webPageOrFile", "to", "name"}) {
-        pelmo->selection().setPeople({});
-        window->setTo("set by the program");
-        window->setName("set by the program");
-        QTest::keyClicks(child<QLineEdit>(field), "x");
-        EXPECT_EQ(pelmo->getPeople().has_value(), QString("subject webPageOrFile").contains(field));
-    }
 }
 
 class Preferences : public GuiFixture {
 protected:
     PreferencesDialog* open() {
         child<QAction>("preferencesAction")->trigger();
-        EXPECT_NE(asked<PreferencesDialog>(), nullptr);
         return asked<PreferencesDialog>();
     }
     static QString stored(const char* key) {
@@ -167,20 +142,17 @@ TEST_F(Preferences, ShowWhatIsStoredAndOkStoresWhatIsEntered) {
     } fields[] = {
         {"senderName", "Me", "Me", " You ", "You"},
         {"senderEmail", {}, "", "me@example.org", "me@example.org"},
-        {"serverAddress", "mail.example.org", "mail.example.org", "", ""},
         {"loginUsername", {}, "", "me", "me"},
         // Ports above 65365 are the controller's to refuse, with a message that says so.
         {"serverPort", "587", "587", "65366", "65366"},
         {"useSSL", "true", "true", "false", "false"},
         {"selectedAuthentication", "3", "CRAM-MD5", "LOGIN", "2"},
-        {"selectedContentType", {}, "Rich text (HTML)", "Plain text", "1"},
-        {"completionAction", "2", "Clear the message", "Quit Pelmo", "1"},
+        {"completionAction", {}, "Do nothing", "Clear the message", "2"},
         // A stored choice without an item shows blank and is kept as it was.
         {"selectedCharacterSet", "9", "", {}, "9"},
     };
     for (const auto& field : fields)
-        if (!field.before.isNull())
-            set(field.key, field.before);
+        set(field.key, field.before);
     PreferencesDialog* dialog = open();
     for (const auto& field : fields) {
         QWidget* widget = child<QWidget>(field.key, dialog);
@@ -213,7 +185,6 @@ TEST_F(Preferences, ThePasswordsPlaceIsToldAndKept) {
 
 } // namespace
 
-// The windows need a QApplication.
 int main(int argc, char** argv) {
     return runTestsIn<QApplication>(argc, argv);
 }

@@ -28,15 +28,14 @@ protected:
             texts << list(name)->item(row)->text();
         return texts.join(", ");
     }
-    // Who a Send would mail one by one: the chosen group's members, or "none" for To alone.
     QString pending() const {
         QStringList names;
         for (const Person& person : pelmo->getPeople().value_or(QList<Person>()))
             names << person.firstName;
         return pelmo->getPeople() ? names.join(' ') : "none";
     }
-    // Presses button and answers what it asks: a name, or the box's button of that text. Tells
-    // what was asked, then after " / " why the book refused the change.
+    // Presses button and answers what it asks: a name, or the box's button of that text; tells
+    // what was asked.
     QString answer(const char* button, const QString& reply) {
         child<QPushButton>(button, &picker())->click();
         QString told;
@@ -50,10 +49,6 @@ protected:
                 if (choice->text() == reply)
                     choice->click();
         }
-        if (auto* refusal = asked<QMessageBox>()) {
-            told += " / " + refusal->informativeText();
-            refusal->accept();
-        }
         return told;
     }
     qint64 bob = 0;
@@ -61,15 +56,16 @@ protected:
 
 // A choice made while the picker is the active window fills To and Name; made while another
 // window is (a script choosing, the book changing), it changes only who is mailed. Of several
-// groups ("+" adds one to the choice) the first in the list counts, whatever the click order.
+// groups (Ctrl adds one to the choice) the first in the list counts, whatever the click order.
 TEST_F(Picker, TheActiveWindowDecidesWhatAChoiceFills) {
     const struct {
         bool inPicker;
         const char* list;
         QString item, shown;
+        Qt::KeyboardModifiers keys = {};
     } choices[] = {
         {false, "groups", "Family", "kept / Kept / Cy"},
-        {true, "groups", "+Club", "Club / Club / Ann Bob"},
+        {true, "groups", "Club", "Club / Club / Ann Bob", Qt::ControlModifier},
         {true, "persons", "Ann Able", "ann@example.org / Ann Able / none"},
         {true, "addresses", "ann@work.example", "ann@work.example / Ann Able / none"},
         {false, "persons", "Bob Baker", "kept / Kept / none"},
@@ -79,15 +75,16 @@ TEST_F(Picker, TheActiveWindowDecidesWhatAChoiceFills) {
         window->setTo("kept");
         window->setName("Kept");
         QWidget* active = choice.inPicker ? static_cast<QWidget*>(&picker()) : window.get();
-        if (choice.inPicker)
-            child<QAction>("addressesAction")->trigger(); // brings the picker to the front
-        else
-            window->activateWindow();
+        choice.inPicker ? child<QAction>("addressesAction")->trigger() : window->activateWindow();
         ASSERT_TRUE(waitUntil([active] { return active->isActiveWindow(); }));
-        const bool added = choice.item.startsWith('+');
-        clickRow(list(choice.list), choice.item.mid(added),
-                 added ? Qt::ControlModifier : Qt::NoModifier);
+        clickRow(list(choice.list), choice.item, choice.keys);
         EXPECT_EQ(window->to() + " / " + window->name() + " / " + pending(), choice.shown);
+    }
+    // Only the user's edits of To or Name, not the program's, drop the group chosen.
+    for (const char* field : {"subject", "webPageOrFile", "to", "name"}) {
+        pelmo->selection().setPeople({});
+        QTest::keyClicks(child<QLineEdit>(field), "x");
+        EXPECT_EQ(pending(), QString("to name").contains(field) ? "none" : "") << field;
     }
 }
 
@@ -95,23 +92,20 @@ TEST_F(Picker, ReloadKeepsTheChoiceAndTellsOnlyOfChangedAddresses) {
     child<QAction>("addressesAction")->trigger();
     ASSERT_TRUE(waitUntil([this] { return picker().isActiveWindow(); }));
     clickRow(list("persons"), "Bob Baker");
-    QSignalSpy named(&picker(), &PeoplePicker::nameSelectionChanged);
     QSignalSpy changed(&picker(), &PeoplePicker::displayedPropertyChanged);
     addPerson("Dee", "Dunn", "Club");
     picker().reload();
-    Person moved = *book->person(bob);
-    moved.emails = {"bob@new.example"};
-    book->updatePerson(moved);
+    book->updatePerson({bob, "Bob", "Baker", {"bob@new.example"}, 0});
     picker().reload();
     EXPECT_EQ(rows("persons"), "Ann Able, Bob Baker, Cy Cole, Dee Dunn");
-    EXPECT_EQ(QString("%1 %2 ").arg(named.size()).arg(changed.size()) + window->to(),
-              "0 1 bob@new.example");
+    EXPECT_EQ(QString::number(changed.size()) + " " + window->to(), "1 bob@new.example");
 }
 
 TEST_F(Picker, EditingGroupsAndPersonsAsksFirst) {
     EXPECT_EQ(answer("newGroup", "Chess"), "");
-    EXPECT_EQ(answer("newGroup", "club"), " / There is already a group named \"Club\".");
-    EXPECT_EQ(rows("groups"), "All, Chess, Club, Family");
+    EXPECT_EQ(answer("newGroup", "club"), "");
+    EXPECT_EQ(asked<QMessageBox>()->informativeText(), "There is already a group named \"Club\".");
+    asked<QMessageBox>()->accept();
     clickRow(list("groups"), "Club");
     EXPECT_EQ(answer("renameGroup", "Bridge"), "Club");
     clickRow(list("persons"), "Ann Able");
@@ -130,7 +124,6 @@ TEST_F(Picker, ThePersonDialogSavesOnlyWhatTheBookTakes) {
     clickRow(list("groups"), "Family");
     child<QPushButton>("newPerson", &picker())->click();
     auto* dialog = asked<PersonDialog>();
-    ASSERT_NE(dialog, nullptr);
     QTest::keyClicks(child<QLineEdit>("firstName", dialog), "Dee");
     QTest::keyClicks(child<QLineEdit>("lastName", dialog), "Dunn");
     dialog->addAddress("dee at example.org");
@@ -148,22 +141,19 @@ TEST_F(Picker, ThePersonDialogSavesOnlyWhatTheBookTakes) {
     EXPECT_EQ(dee.emails.join(' ') + " / " + dee.primaryEmail(),
               "dee@home.example dee@example.org / dee@home.example");
 
-    // Opened again from the list: the second address made primary, Family left for Club.
+    // Opened again from the list: the second address made primary, Family left.
     clickRow(list("persons"), "Dee Dunn");
     QTest::mouseDClick(list("persons")->viewport(), Qt::LeftButton, {},
                        list("persons")->visualItemRect(list("persons")->item(1)).center());
     dialog = asked<PersonDialog>();
-    ASSERT_NE(dialog, nullptr);
     qobject_cast<QAbstractButton*>(child<QTableWidget>("addresses", dialog)->cellWidget(1, 0))
         ->click();
     for (QListWidgetItem* group :
          child<QListWidget>("groups", dialog)->findItems("", Qt::MatchContains))
         group->setCheckState(group->checkState() ? Qt::Unchecked : Qt::Checked);
     dialog->accept();
-    const QList<Group> groups = book->groupsOf(dee.id);
-    EXPECT_EQ(book->person(dee.id)->primaryEmail() + " / " + QString::number(groups.size()) + " " +
-                  groups.value(0).name,
-              "dee@example.org / 1 Club");
+    EXPECT_EQ(rows("persons") + " / " + book->person(dee.id)->primaryEmail(),
+              "Cy Cole / dee@example.org");
 }
 
 } // namespace
