@@ -1,19 +1,16 @@
 #pragma once
 
 #include <QDesktopServices>
-#include <QList>
 #include <QObject>
 #include <QUrl>
 
-// Stands in for the desktop while it lives: QDesktopServices hands file URLs to it instead of
-// opening them.
+// While it lives, file URLs that QDesktopServices would open are handed to it instead.
 class DesktopStandIn : public QObject {
     Q_OBJECT
 
 public:
-    DesktopStandIn() { QDesktopServices::setUrlHandler(QStringLiteral("file"), this, "open"); }
-    ~DesktopStandIn() override { QDesktopServices::unsetUrlHandler(QStringLiteral("file")); }
-
+    DesktopStandIn() { QDesktopServices::setUrlHandler("file", this, "open"); }
+    ~DesktopStandIn() override { QDesktopServices::unsetUrlHandler("file"); }
     QList<QUrl> opened;
 
 public Q_SLOTS:

@@ -8,6 +8,7 @@
 #include <QIODevice>
 #include <QMimeData>
 #include <QUrl>
+#include <QtEndian>
 
 #include <algorithm>
 
@@ -17,6 +18,11 @@ namespace {
 constexpr QDataStream::Version rowStreamVersion = QDataStream::Qt_6_4;
 
 QList<int> readRows(const QByteArray& bytes) {
+    // The count in front comes from whoever made the drag, and the stream would reserve room
+    // for that many rows before reading one: believe it only if exactly that many follow.
+    if (bytes.size() < 4 ||
+        qFromBigEndian<quint32>(bytes.constData()) * 4ull != quint64(bytes.size()) - 4)
+        return {};
     QDataStream stream(bytes);
     stream.setVersion(rowStreamVersion);
     QList<qint32> rows;

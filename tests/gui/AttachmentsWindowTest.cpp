@@ -1,199 +1,109 @@
 #include "gui/AttachmentsWindow.h"
 #include "DesktopStandIn.h"
 #include "GuiFixture.h"
+#include "RowName.h"
 #include "attachments/AttachmentsController.h"
 #include "gui/AttachmentsModel.h"
 
-#include <QAction>
-#include <QDir>
 #include <QDropEvent>
-#include <QFile>
 #include <QMimeData>
-#include <QPushButton>
+#include <QSignalSpy>
 #include <QTableView>
-#include <QUrl>
-
-#include <memory>
 
 namespace {
 
-// The attachments window with real drags dropped on its table: the view's own drag events
-// carrying real QMimeData, file URLs as a file manager sends them or the table's private row
-// type as the table itself puts it on a drag.
+// The attachments window, opened from the main window, holding /a /b /c /d; drags are dropped
+// on its table by the view's own events, as a file manager or the table itself sends them.
 class AttachmentsTable : public GuiFixture {
 protected:
     void SetUp() override {
         GuiFixture::SetUp();
-        ASSERT_TRUE(files.isValid());
-        ASSERT_TRUE(QDir(files.path()).mkdir(QStringLiteral("folder")));
         child<QAction>("attachmentsAction")->trigger();
-        ASSERT_TRUE(QTest::qWaitForWindowExposed(&window->attachmentsWindow()));
         table = child<QTableView>("attachmentsTable", &window->attachmentsWindow());
+        window->attachments().addFiles({"/a", "/b", "/c", "/d"});
     }
-
-    QString file(const char* name) {
-        const QString path = files.filePath(QLatin1String(name));
-        QFile made(path);
-        EXPECT_TRUE(made.open(QIODevice::WriteOnly));
-        return path;
-    }
-
-    QString folder() const { return files.filePath(QStringLiteral("folder")); }
-
-    static std::unique_ptr<QMimeData> fileDrag(const QStringList& paths) {
-        auto data = std::make_unique<QMimeData>();
-        QList<QUrl> urls;
-        for (const QString& path : paths)
-            urls << QUrl::fromLocalFile(path);
-        data->setUrls(urls);
-        return data;
-    }
-
-    std::unique_ptr<QMimeData> rowDrag(const QList<int>& rows) const {
-        QModelIndexList indexes;
-        for (const int row : rows)
-            indexes << model().index(row, 0);
-        return std::unique_ptr<QMimeData>(model().mimeData(indexes));
-    }
-
     AttachmentsModel& model() const { return window->attachmentsWindow().model(); }
-
-    // Where a drag lands at insertion row: the top edge of that row, or below the last.
-    QPoint insertionPoint(int row) const {
-        if (row < model().rowCount()) {
-            const QRect rect = table->visualRect(model().index(row, 0));
-            return {rect.center().x(), rect.top() + 1};
-        }
-        return {table->viewport()->width() / 2, table->viewport()->height() - 2};
-    }
-
-    // Drags data over the table and drops it at point; answers whether the hover was accepted.
-    bool drop(const QMimeData& data, QPoint point, Qt::DropAction action = Qt::CopyAction) {
-        QWidget* viewport = table->viewport();
-        QDragEnterEvent enter(point, action, &data, Qt::LeftButton, Qt::NoModifier);
-        QCoreApplication::sendEvent(viewport, &enter);
-        QDragMoveEvent move(point, action, &data, Qt::LeftButton, Qt::NoModifier);
-        QCoreApplication::sendEvent(viewport, &move);
-        if (!move.isAccepted()) {
-            QDragLeaveEvent leave;
-            QCoreApplication::sendEvent(viewport, &leave);
-            return false;
-        }
-        QDropEvent dropped(point, action, &data, Qt::LeftButton, Qt::NoModifier);
-        QCoreApplication::sendEvent(viewport, &dropped);
-        return true;
-    }
-
-    // Puts paths in the list one by one at the end, so that it holds them in that order.
-    void fill(const QStringList& paths) {
-        for (const QString& path : paths)
-            ASSERT_TRUE(drop(*fileDrag({path}), insertionPoint(model().rowCount())));
-        ASSERT_EQ(list(), paths);
-    }
-
-    QStringList list() const { return window->attachments().getAttachments(); }
-
-    QStringList shown() const {
+    QRect rect(int row) const { return table->visualRect(model().index(row, 0)); }
+    QString shown() const {
         QStringList rows;
         for (int row = 0; row < model().rowCount(); ++row)
             rows << model().index(row, 0).data().toString();
-        return rows;
+        return rows.join(' ');
     }
-
-    QTemporaryDir files;
     QTableView* table = nullptr;
 };
 
-TEST_F(AttachmentsTable, FilesLandInReverseOrderAtTheDropPoint) {
-    const QString x = file("x.txt"), y = file("y.txt");
-    fill({x, y});
-    const QString a = file("a.txt"), b = file("b.txt"), c = file("c.txt");
-    ASSERT_TRUE(drop(*fileDrag({a, b, c}), insertionPoint(1)));
-    EXPECT_EQ(list(), (QStringList{x, c, b, a, y}));
-    EXPECT_EQ(shown(), list());
-    // What every message will carry: the controller's own list.
-    EXPECT_EQ(controller().getAttachments().getAttachments(), (QStringList{x, c, b, a, y}));
+// Rows in the private type, file URLs ("/" is a folder, the others do not exist), or both, or
+// junk in the private type; dropped at the top edge of row at, or below the last row.
+struct Drop {
+    std::string name;
+    QList<int> rows;
+    QStringList urls;
+    int at;
+    QString expected;
+    bool taken, junk = false;
+    friend void PrintTo(const Drop& row, std::ostream* out) { *out << row.name; }
+};
+
+class Drops : public AttachmentsTable, public ::testing::WithParamInterface<Drop> {};
+
+TEST_P(Drops, Land) {
+    const Drop& row = GetParam();
+    auto data = row.rows.isEmpty() ? std::make_unique<QMimeData>()
+                                   : AttachmentsController::rowDragData(row.rows);
+    if (row.junk)
+        data->setData(AttachmentsController::privateDragType, "not an index set");
+    data->setUrls(QUrl::fromStringList(row.urls));
+    const Qt::DropAction action = data->hasUrls() ? Qt::CopyAction : Qt::MoveAction;
+    const QPoint at = rect(row.at).isValid() ? rect(row.at).topLeft() + QPoint(5, 1)
+                                             : QPoint(5, table->viewport()->height() - 2);
+    QDragEnterEvent enter(at, action, data.get(), Qt::LeftButton, {});
+    QDropEvent dropped(at, action, data.get(), Qt::LeftButton, {});
+    QSignalSpy changes(&window->attachments(), &AttachmentsController::attachmentsChanged);
+    QCoreApplication::sendEvent(table->viewport(), &enter);
+    QCoreApplication::sendEvent(table->viewport(), &dropped);
+    EXPECT_EQ(enter.isAccepted() && dropped.isAccepted(), row.taken);
+    EXPECT_EQ(shown() + " / " + QString::number(changes.size()),
+              row.expected + (row.expected == "/a /b /c /d" ? " / 0" : " / 1"));
 }
 
-TEST_F(AttachmentsTable, AFolderFirstIsRefusedAsAWhole) {
-    const QString a = file("a.txt");
-    EXPECT_FALSE(drop(*fileDrag({folder(), a}), insertionPoint(0)));
-    EXPECT_TRUE(list().isEmpty());
-}
+INSTANTIATE_TEST_SUITE_P(
+    Rows, Drops,
+    ::testing::Values(
+        // Each file goes in at the same index, so several land in reverse order.
+        Drop{"files", {}, {"file:///x", "file:///y"}, 1, "/a /y /x /b /c /d", true},
+        Drop{"below_last", {}, {"file:///x"}, -1, "/a /b /c /d /x", true},
+        Drop{"duplicate", {}, {"file:///a"}, 0, "/a /a /b /c /d", true},
+        Drop{"web_left_out", {}, {"https://e.org/p", "file:///x"}, 3, "/a /b /c /x /d", true},
+        Drop{"web_only", {}, {"https://e.org/p"}, 0, "/a /b /c /d", false},
+        // Only the first file is judged: a folder after it comes along.
+        Drop{"folder_first", {}, {"file:///", "file:///x"}, 0, "/a /b /c /d", false},
+        Drop{"folder_second", {}, {"file:///x", "file:///"}, 0, "/ /x /a /b /c /d", true},
+        // A row lands above the drop point; of several rows only the first moves.
+        Drop{"down", {0}, {}, 3, "/b /c /a /d", true}, Drop{"up", {2}, {}, 0, "/c /a /b /d", true},
+        Drop{"first_of_two", {3, 1}, {}, 0, "/b /a /c /d", true},
+        Drop{"own_place", {1}, {}, 1, "/a /b /c /d", true},
+        Drop{"rows_before_urls", {2}, {"file:///x"}, 0, "/c /a /b /d", true},
+        Drop{"junk", {}, {}, 0, "/a /b /c /d", false, true}),
+    RowName());
 
-TEST_F(AttachmentsTable, AFolderSecondIsTakenWithTheRest) {
-    const QString a = file("a.txt");
-    ASSERT_TRUE(drop(*fileDrag({a, folder()}), insertionPoint(0)));
-    EXPECT_EQ(list(), (QStringList{folder(), a}));
-}
-
-TEST_F(AttachmentsTable, ADropOntoARowIsRefused) {
-    const QString x = file("x.txt");
-    fill({x});
-    const std::unique_ptr<QMimeData> data = fileDrag({file("a.txt")});
-    EXPECT_FALSE(model().canDropMimeData(data.get(), Qt::CopyAction, -1, -1, model().index(0, 0)));
-    EXPECT_FALSE(model().dropMimeData(data.get(), Qt::CopyAction, -1, -1, model().index(0, 0)));
-    EXPECT_TRUE(model().canDropMimeData(data.get(), Qt::CopyAction, 0, 0, QModelIndex()));
-    EXPECT_EQ(list(), QStringList{x});
-}
-
-TEST_F(AttachmentsTable, ADragOfNeitherFilesNorRowsIsRefused) {
-    QMimeData web;
-    web.setUrls({QUrl(QStringLiteral("https://example.org/a.pdf"))});
-    web.setText(QStringLiteral("a.pdf"));
-    EXPECT_FALSE(drop(web, insertionPoint(0)));
-    EXPECT_TRUE(list().isEmpty());
-}
-
-TEST_F(AttachmentsTable, RowsDragCarryThePrivateType) {
-    fill({file("a.txt"), file("b.txt")});
-    const std::unique_ptr<QMimeData> data = rowDrag({1});
-    EXPECT_TRUE(data->hasFormat(QStringLiteral("MyPrivateTableViewDataType")));
-    EXPECT_FALSE(data->hasUrls());
-    EXPECT_EQ(model().mimeTypes().constFirst(), QStringLiteral("MyPrivateTableViewDataType"));
-}
-
-TEST_F(AttachmentsTable, ARowDraggedDownLandsAboveTheDropPoint) {
-    const QString a = file("a.txt"), b = file("b.txt"), c = file("c.txt");
-    fill({a, b, c});
-    ASSERT_TRUE(drop(*rowDrag({0}), insertionPoint(3), Qt::MoveAction));
-    EXPECT_EQ(list(), (QStringList{b, c, a}));
-    ASSERT_TRUE(drop(*rowDrag({2}), insertionPoint(0), Qt::MoveAction));
-    EXPECT_EQ(list(), (QStringList{a, b, c}));
-}
-
-TEST_F(AttachmentsTable, OfSeveralDraggedRowsOnlyTheFirstMoves) {
-    const QString a = file("a.txt"), b = file("b.txt"), c = file("c.txt"), d = file("d.txt");
-    fill({a, b, c, d});
-    ASSERT_TRUE(drop(*rowDrag({3, 1}), insertionPoint(0), Qt::MoveAction));
-    EXPECT_EQ(list(), (QStringList{b, a, c, d}));
-}
-
-TEST_F(AttachmentsTable, RemoveTakesTheSelectedRowsOrAll) {
-    const QString a = file("a.txt"), b = file("b.txt"), c = file("c.txt");
-    fill({a, b, c});
-    table->selectionModel()->select(model().index(0, 0),
-                                    QItemSelectionModel::Select | QItemSelectionModel::Rows);
-    table->selectionModel()->select(model().index(2, 0),
-                                    QItemSelectionModel::Select | QItemSelectionModel::Rows);
+TEST_F(AttachmentsTable, RowsAreDraggedOpenedAndRemoved) {
+    // The table's own drags, which never land onto a row.
+    const std::unique_ptr<QMimeData> rows(model().mimeData({model().index(1, 0)}));
+    EXPECT_EQ(rows->formats(), QStringList{"MyPrivateTableViewDataType"});
+    EXPECT_FALSE(model().dropMimeData(rows.get(), Qt::MoveAction, -1, -1, model().index(3, 0)));
+    DesktopStandIn desktop;
+    // A double click is a click and then the second press, as the platform delivers it.
+    QTest::mouseClick(table->viewport(), Qt::LeftButton, {}, rect(1).center());
+    QTest::mouseDClick(table->viewport(), Qt::LeftButton, {}, rect(1).center());
+    EXPECT_EQ(desktop.opened, QList<QUrl>{QUrl::fromLocalFile("/b")});
+    QTest::mouseClick(table->viewport(), Qt::LeftButton, Qt::ControlModifier, rect(3).center());
     auto* remove = child<QPushButton>("deleteButton", &window->attachmentsWindow());
     QTest::mouseClick(remove, Qt::LeftButton);
-    EXPECT_EQ(list(), QStringList{b});
+    EXPECT_EQ(shown(), "/a /c");
     table->clearSelection();
     QTest::mouseClick(remove, Qt::LeftButton);
-    EXPECT_TRUE(list().isEmpty());
-    EXPECT_TRUE(controller().getAttachments().getAttachments().isEmpty());
-}
-
-TEST_F(AttachmentsTable, DoubleClickOpensTheFileOnTheDesktop) {
-    const QString a = file("a.txt"), b = file("b.txt");
-    fill({a, b});
-    DesktopStandIn desktop;
-    const QPoint row1 = table->visualRect(model().index(1, 0)).center();
-    // A double click is a click and then the second press, as the platform delivers it.
-    QTest::mouseClick(table->viewport(), Qt::LeftButton, Qt::NoModifier, row1);
-    QTest::mouseDClick(table->viewport(), Qt::LeftButton, Qt::NoModifier, row1);
-    EXPECT_EQ(desktop.opened, QList<QUrl>{QUrl::fromLocalFile(b)});
+    EXPECT_EQ(shown(), "");
 }
 
 } // namespace
