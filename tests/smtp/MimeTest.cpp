@@ -156,7 +156,7 @@ TEST_P(Message, ReadBack) {
     EXPECT_TRUE(std::all_of(headers.begin(), headers.end(), [](char c) { return c > 0; }));
     EXPECT_FALSE(headers.contains("Content-Transfer-Encoding") || bytes.contains("victim"));
     const QDateTime date = QDateTime::fromString(read.date, Qt::RFC2822Date);
-    EXPECT_LE(std::abs(date.secsTo(QDateTime::currentDateTime())), 60) << read.date.toStdString();
+    EXPECT_TRUE(date.isValid() && std::abs(date.secsTo(QDateTime::currentDateTime())) <= 60);
     EXPECT_NE(read.messageId, parseMessage(Mail().message.toBytes()).messageId);
     EXPECT_EQ(mail.message.envelopeSender(), mail.sender);
     EXPECT_EQ(mail.message.envelopeRecipients(), QStringList{mail.recipient});
