@@ -1,12 +1,7 @@
 #!/usr/bin/env python3
-"""A real SMTP server for the SmtpClient tests, built on aiosmtpd.
-
-Listens on 127.0.0.1 (a free port unless --port is given) and prints "PORT <n>" once it
-accepts connections. Every message it accepts is printed as one JSON line:
-{"mail_from": ..., "mail_options": [...], "rcpt_tos": [...], "data": <base64 of the bytes>}.
-It stops when its standard input closes or after --lifetime seconds, whichever comes first,
-so a test that dies never leaves it behind.
-"""
+"""A real SMTP server for tests, aiosmtpd on 127.0.0.1. Prints "PORT <n>" once it accepts
+connections, then a JSON line per accepted message: mail_from, mail_options, rcpt_tos and data
+(base64). Stops when its standard input closes or after --lifetime seconds."""
 
 import argparse
 import asyncio
@@ -23,10 +18,9 @@ from aiosmtpd.smtp import SMTP, AuthResult, LoginPassword, auth_mechanism
 
 
 class Handler:
-    def __init__(self, user, password, refused_recipients):
-        self.user = user
-        self.password = password
-        self.refused_recipients = set(refused_recipients)
+    def __init__(self, args):
+        self.user, self.password = args.user.encode(), args.password.encode()
+        self.refused_recipients = set(args.refuse_recipient)
 
     async def handle_RCPT(self, server, session, envelope, address, rcpt_options):
         if address in self.refused_recipients:
@@ -35,12 +29,9 @@ class Handler:
         return "250 2.1.5 OK"
 
     async def handle_DATA(self, server, session, envelope):
-        record = {
-            "mail_from": envelope.mail_from,
-            "mail_options": envelope.mail_options,
-            "rcpt_tos": envelope.rcpt_tos,
-            "data": base64.b64encode(envelope.original_content).decode("ascii"),
-        }
+        record = {"mail_from": envelope.mail_from, "mail_options": envelope.mail_options,
+                  "rcpt_tos": envelope.rcpt_tos,
+                  "data": base64.b64encode(envelope.original_content).decode("ascii")}
         print(json.dumps(record), flush=True)
         return "250 2.0.0 Message accepted"
 
@@ -53,63 +44,43 @@ class Handler:
             return AuthResult(success=False, handled=True)
         user, _, digest = response.rpartition(b" ")
         expected = hmac.new(self.password, challenge, "md5").hexdigest().encode("ascii")
-        ok = user == self.user and hmac.compare_digest(digest, expected)
-        return AuthResult(success=ok, handled=False)
+        return AuthResult(success=user == self.user and hmac.compare_digest(digest, expected),
+                          handled=False)
 
     def authenticate(self, server, session, envelope, mechanism, auth_data):
-        ok = (
-            isinstance(auth_data, LoginPassword)
-            and auth_data.login == self.user
-            and hmac.compare_digest(auth_data.password, self.password)
-        )
+        ok = (isinstance(auth_data, LoginPassword) and auth_data.login == self.user
+              and hmac.compare_digest(auth_data.password, self.password))
         return AuthResult(success=ok, handled=False)
-
-
-def tls_context(args):
-    context = ssl.create_default_context(ssl.Purpose.CLIENT_AUTH)
-    context.load_cert_chain(args.cert, args.key)
-    return context
-
-
-def parse_arguments():
-    parser = argparse.ArgumentParser(description=__doc__)
-    parser.add_argument("--port", type=int, default=0)
-    parser.add_argument("--tls", choices=["none", "starttls", "implicit"], default="none")
-    parser.add_argument("--require-starttls", action="store_true")
-    parser.add_argument("--cert", help="server certificate (PEM), for --tls starttls or implicit")
-    parser.add_argument("--key", help="its private key (PEM)")
-    parser.add_argument("--user", default="user")
-    parser.add_argument("--password", default="secret")
-    parser.add_argument("--refuse-recipient", action="append", default=[])
-    parser.add_argument("--size", type=int, default=10 * 1024 * 1024, help="announced SIZE")
-    parser.add_argument("--lifetime", type=float, default=60.0)
-    return parser.parse_args()
 
 
 def main():
-    args = parse_arguments()
+    parser = argparse.ArgumentParser(description=__doc__)
+    parser.add_argument("--tls", choices=["none", "starttls", "implicit"], default="none")
+    parser.add_argument("--require-starttls", action="store_true")
+    parser.add_argument("--cert")  # PEM files of the server's certificate and key, for TLS
+    parser.add_argument("--key")
+    parser.add_argument("--user", default="user")
+    parser.add_argument("--password", default="secret")
+    parser.add_argument("--refuse-recipient", action="append", default=[])
+    parser.add_argument("--size", type=int, default=10 * 1024 * 1024)
+    parser.add_argument("--lifetime", type=float, default=60.0)
+    args = parser.parse_args()
     logging.getLogger("mail.log").setLevel(logging.CRITICAL)
-    handler = Handler(args.user.encode(), args.password.encode(), args.refuse_recipient)
-    starttls = tls_context(args) if args.tls == "starttls" else None
-    implicit = tls_context(args) if args.tls == "implicit" else None
+    handler = Handler(args)
+    context = ssl.create_default_context(ssl.Purpose.CLIENT_AUTH)
+    if args.tls != "none":
+        context.load_cert_chain(args.cert, args.key)
+    starttls = context if args.tls == "starttls" else None
     loop = asyncio.new_event_loop()
 
     def new_session():
-        return SMTP(
-            handler,
-            hostname="localhost",
-            tls_context=starttls,
-            require_starttls=args.require_starttls,
-            # With STARTTLS, AUTH is announced only once TLS is up, as real servers do.
-            auth_require_tls=starttls is not None,
-            authenticator=handler.authenticate,
-            data_size_limit=args.size,
-            loop=loop,
-        )
+        # With STARTTLS, AUTH is announced only once TLS is up, as real servers do.
+        return SMTP(handler, hostname="localhost", tls_context=starttls,
+                    require_starttls=args.require_starttls, auth_require_tls=starttls is not None,
+                    authenticator=handler.authenticate, data_size_limit=args.size, loop=loop)
 
-    server = loop.run_until_complete(
-        loop.create_server(new_session, "127.0.0.1", args.port, ssl=implicit)
-    )
+    server = loop.run_until_complete(loop.create_server(
+        new_session, "127.0.0.1", 0, ssl=context if args.tls == "implicit" else None))
     print(f"PORT {server.sockets[0].getsockname()[1]}", flush=True)
 
     def on_stdin():

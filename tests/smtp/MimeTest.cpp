@@ -1,0 +1,253 @@
+// What goes into a message: its assembly, read back with GMime's parser as a receiving mail
+// reader would; the quoted-printable encoding of its files; the HTML of its body.
+
+#include "e2e/E2eSupport.h"
+#include "smtp/HtmlCharset.h"
+#include "smtp/MessageAssembly.h"
+#include "smtp/QuotedPrintable.h"
+#include "util/PelmoException.h"
+
+#include <QDateTime>
+#include <QDir>
+#include <QFile>
+#include <QRandomGenerator>
+#include <QRegularExpression>
+#include <QTextDocument>
+#include <gmime/gmime.h>
+#include <gtest/gtest.h>
+
+namespace {
+
+QString dataFile(const char* name) {
+    QFile file(QStringLiteral(PELMO_TEST_DATA "/smtp/") + QString::fromLatin1(name));
+    EXPECT_TRUE(file.open(QIODevice::ReadOnly)) << name;
+    return QString::fromUtf8(file.readAll());
+}
+
+// "\r", "\n", "\0" and "\xHH" stand for those bytes, "\" followed by anything else for that.
+QByteArray unescape(const QByteArray& text) {
+    QByteArray out;
+    for (qsizetype i = 0; i < text.size(); ++i) {
+        if (text[i] != '\\' || i + 1 == text.size())
+            out += text[i];
+        else if (const char c = text[++i]; c == 'x')
+            out += static_cast<char>(text.mid(i + 1, 2).toInt(nullptr, 16)), i += 2;
+        else
+            out += c == 'r' ? '\r' : c == 'n' ? '\n' : c == '0' ? '\0' : c;
+    }
+    return out;
+}
+
+// Every byte value, line break bytes included, as a binary file may hold them.
+QByteArray binary() {
+    QByteArray bytes("%PDF-1.4\r\n\n\r");
+    for (int value = 255; value >= 0; --value)
+        bytes += static_cast<char>(value);
+    return bytes + "\n%%EOF ";
+}
+
+// A message from Ada to Charles (who replaced an earlier recipient), then made by a recipe.
+struct Mail {
+    MessageAssembly message;
+    QTemporaryDir dir;
+    QList<QByteArray> files; // what each attached file holds, in order
+    QString sender = QStringLiteral("ada@example.org"), recipient = "charles@example.net";
+
+    Mail() {
+        message.setTo(QStringLiteral("Someone Else"), QStringLiteral("else@example.com"));
+        message.setFrom(QStringLiteral("Ada Lovelace"), sender);
+        message.setTo(QStringLiteral("Charles Babbage"), recipient);
+    }
+
+    // Returns the name of the PelmoException the recipe ended in, if any.
+    std::string make(const QString& recipe) try {
+        for (const QString& step : recipe.split('\n', Qt::SkipEmptyParts)) {
+            const QString verb = step.section(' ', 0, 0);
+            QByteArrayList raw = step.mid(verb.size() + 1).toUtf8().split('|');
+            QStringList field;
+            for (QByteArray& value : raw)
+                field += QString::fromUtf8(value = unescape(value.trimmed()));
+            if (verb == "subject")
+                message.setSubject(field[0]);
+            else if (verb == "from")
+                message.setFrom(field[0], field.value(1)), sender = field.value(1);
+            else if (verb == "to")
+                message.setTo(field[0], field.value(1)), recipient = field.value(1);
+            else if (verb == "part")
+                message.addBodyPart(field[2], field[0], field[1].toInt());
+            else if (verb == "file")
+                attach(field[0], raw[1] == "binary" ? binary() : raw[1]);
+            else if (verb == "unreadable" &&
+                     (!field[0].endsWith('/') || QDir(dir.path()).mkpath(field[0])))
+                EXPECT_FALSE(
+                    message.addAttachment(field[0].isEmpty() ? "" : dir.filePath(field[0])));
+            else
+                ADD_FAILURE() << "cannot " << step.toStdString();
+        }
+        return {};
+    } catch (const PelmoException& failure) {
+        EXPECT_FALSE(failure.reason().isEmpty());
+        return failure.name().toStdString();
+    }
+
+    void attach(const QString& name, const QByteArray& bytes) {
+        QFile file(dir.filePath(name));
+        EXPECT_TRUE(file.open(QIODevice::WriteOnly) && file.write(bytes) == bytes.size());
+        file.close();
+        EXPECT_TRUE(message.addAttachment(file.fileName())) << name.toStdString();
+        files += bytes;
+    }
+};
+
+// What a reader sees, a line per header and part, bytes beyond printable ASCII %-encoded. The
+// content of a file is left out: it is compared with the file itself.
+QString outline(const ReceivedMessage& message) {
+    QStringList lines = {"From: " + message.from,
+                         "To: " + message.to,
+                         QStringList{"Subject:", message.subject}.join(' ').trimmed(),
+                         "Message-Id at " + message.messageId.section('@', -1),
+                         "MIME-Version: " + message.mimeVersion,
+                         message.topType};
+    for (const ReceivedPart& part : message.parts) {
+        const QByteArray shown = part.content.toPercentEncoding(" !\"#$&'()*+,/:;<=>?@[\\]^`{|}");
+        lines += QStringList{part.mimeType, part.charset, part.encoding, part.filename,
+                             part.filename.isEmpty() ? '"' + QString::fromLatin1(shown) + '"' : ""}
+                     .filter(QRegularExpression(QStringLiteral(".")))
+                     .join(' ');
+    }
+    return lines.join('\n');
+}
+
+// The message as it goes on the wire, LF for CRLF, with what changes from one run to the next
+// (the date, the Message-ID and the boundary) made placeholders.
+QString wire(const QByteArray& bytes) {
+    QString text = QString::fromLatin1(bytes).replace(QStringLiteral("\r\n"), QStringLiteral("\n"));
+    const QRegularExpression::PatternOption lines = QRegularExpression::MultilineOption;
+    text.replace(QRegularExpression("boundary=\"([^\"]+)\"").match(text).captured(1), "BOUNDARY");
+    text.replace(QRegularExpression("^Date: .+$", lines), QStringLiteral("Date: DATE"));
+    return text.replace(QRegularExpression("^Message-Id: <[^@]+@", lines), "Message-Id: <ID@");
+}
+
+// A section: the recipe, "--" and the failure it ends in if any, what a reader sees, and maybe
+// "-- wire" and the message on the wire.
+class Message : public ::testing::TestWithParam<std::string> {};
+
+TEST_P(Message, ReadBack) {
+    const QString section = dataFile("messages.txt")
+                                .section(QString::fromStdString("\n== " + GetParam() + '\n'), 1)
+                                .section("\n== ", 0, 0);
+    const QString expected = section.section("\n--", 1);
+    Mail mail;
+    EXPECT_EQ(mail.make(section.section("\n--", 0, 0)),
+              expected.section('\n', 0, 0).trimmed().toStdString());
+    const QByteArray bytes = mail.message.toBytes();
+    const ReceivedMessage read = parseMessage(bytes);
+    EXPECT_EQ(outline(read).toStdString(),
+              expected.section('\n', 1).section("\n-- wire\n", 0, 0).trimmed().toStdString());
+    if (expected.contains("\n-- wire\n")) {
+        EXPECT_EQ(wire(bytes).trimmed().toStdString(),
+                  expected.section("\n-- wire\n", 1).trimmed().toStdString());
+    }
+
+    // RFC 5322 2.1, 2.2: CRLF line ends only; headers in ASCII, RFC 2047 words for the rest.
+    EXPECT_TRUE(bytes.endsWith("\r\n") && bytes.count('\r') == bytes.count("\r\n") &&
+                bytes.count('\n') == bytes.count("\r\n"));
+    const QByteArray headers = bytes.left(bytes.indexOf("\r\n\r\n"));
+    EXPECT_TRUE(std::all_of(headers.begin(), headers.end(), [](char c) { return c > 0; }));
+    EXPECT_FALSE(headers.contains("Content-Transfer-Encoding") || bytes.contains("victim"));
+    const QDateTime date = QDateTime::fromString(read.date, Qt::RFC2822Date);
+    EXPECT_TRUE(date.isValid() && std::abs(date.secsTo(QDateTime::currentDateTime())) <= 60);
+    EXPECT_NE(read.messageId, parseMessage(Mail().message.toBytes()).messageId);
+    EXPECT_EQ(mail.message.envelopeSender(), mail.sender);
+    EXPECT_EQ(mail.message.envelopeRecipients(), QStringList{mail.recipient});
+    QList<QByteArray> attached;
+    for (const ReceivedPart& part : read.parts)
+        attached += part.filename.isEmpty() ? QList<QByteArray>() : QList{part.content};
+    EXPECT_EQ(attached, mail.files);
+}
+
+std::vector<std::string> sectionNames() {
+    std::vector<std::string> names;
+    for (const auto& match : QRegularExpression("^== (\\w+)$", QRegularExpression::MultilineOption)
+                                 .globalMatch(dataFile("messages.txt")))
+        names.push_back(match.captured(1).toStdString());
+    return names;
+}
+
+INSTANTIATE_TEST_SUITE_P(MessageAssembly, Message, ::testing::ValuesIn(sectionNames()),
+                         [](const auto& row) { return row.param; });
+
+TEST(MessageAssembly, NoMessageWithoutSenderAndRecipient) {
+    MessageAssembly message;
+    EXPECT_TRUE(message.envelopeSender().isEmpty() && message.envelopeRecipients().isEmpty());
+    for (int step = 0; step < 2;
+         ++step, message.setFrom("Ada", QStringLiteral("ada@example.org"))) {
+        try {
+            message.toBytes();
+            ADD_FAILURE() << "a message at step " << step;
+        } catch (const PelmoException& refusal) {
+            EXPECT_EQ(refusal.name(), QStringLiteral("IncompleteMessage"));
+        }
+    }
+}
+
+TEST(QuotedPrintable, EncodesExactly) {
+    int rows = 0;
+    for (const QString& row : dataFile("quoted-printable.txt").split('\n')) {
+        const QStringList field = row.split('|');
+        if (row.startsWith('#') || field.size() != 3)
+            continue;
+        SCOPED_TRACE(field[0].toStdString());
+        EXPECT_EQ(EncodeQuotedPrintable(unescape(field[1].trimmed().toUtf8())).toStdString(),
+                  unescape(field[2].trimmed().toUtf8()).toStdString());
+        ++rows;
+    }
+    EXPECT_EQ(rows, 12);
+}
+
+// RFC 2045 6.7: what GMime's decoder reads back is what went in, in lines of 76 at most.
+TEST(QuotedPrintable, RandomBytesComeBackInShortLines) {
+    QByteArray bytes;
+    QRandomGenerator random(20240501);
+    for (int i = 0; i < 6000; ++i)
+        bytes += static_cast<char>(random.bounded(256));
+    bytes += "ends with a space ";
+    const QByteArray encoded = EncodeQuotedPrintable(bytes);
+    g_mime_init();
+    QByteArray decoded(encoded.size(), '\0');
+    int state = 0;
+    guint32 save = 0;
+    decoded.truncate(static_cast<qsizetype>(g_mime_encoding_quoted_decode_step(
+        reinterpret_cast<const unsigned char*>(encoded.constData()), size_t(encoded.size()),
+        reinterpret_cast<unsigned char*>(decoded.data()), &state, &save)));
+    EXPECT_EQ(decoded, bytes);
+    for (const QByteArray& line : encoded.split('\n'))
+        EXPECT_LE(line.size(), 76);
+    EXPECT_TRUE(encoded.count("=\n") == encoded.count('\n') && !encoded.contains('\r'))
+        << "only soft line breaks";
+}
+
+// The body's HTML declares its set once, and what the set cannot hold becomes a numeric character
+// reference. (How text is escaped or replaced shows in the messages above.)
+TEST(HtmlCharset, ExportDeclaresTheSetAndEscapesTheRest) {
+    QTextDocument document;
+    document.setPlainText(QString::fromUtf8("Café ¥"));
+    const struct {
+        int index;
+        const char* name;
+        QByteArray text;
+    } rows[] = {{0, "utf-8", "Caf\xc3\xa9 \xc2\xa5"},
+                {1, "us-ascii", "Caf&#233; &#165;"},
+                {2, "iso-8859-1", "Caf\xe9 \xa5"},
+                {3, "Shift_JIS", "Caf&#233; &#165;"},
+                {4, "utf-8", "Caf\xc3\xa9 \xc2\xa5"}};
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.index);
+        const QByteArray html = HtmlCharset::forIndex(row.index).exportDocument(document);
+        EXPECT_EQ(html.count("<meta charset="), 1);
+        EXPECT_TRUE(html.contains("<meta charset=\"" + QByteArray(row.name) + "\" />"));
+        EXPECT_TRUE(html.contains(row.text)) << html.toStdString();
+    }
+}
+
+} // namespace
