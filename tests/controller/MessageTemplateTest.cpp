@@ -34,6 +34,9 @@ TEST_F(Tags, ReplacedInAnyLetterCase) {
                   "Dear {toName} ({TO}), from {FromName} <{fRoM}> about {SUBJECT}; {toname}.")),
               QStringLiteral("Dear Ada Lovelace (ada@example.org), from Me Myself "
                              "<me@example.org> about News; Ada Lovelace."));
+    // A tag at the very start, and tags that touch.
+    EXPECT_EQ(content().replaceTags(QStringLiteral("{toName}{TO}")),
+              QStringLiteral("Ada Lovelaceada@example.org"));
     controller->message()->setPlainText(QStringLiteral("Hello {toName},\nsee you.\n{fromName}"));
     EXPECT_EQ(content().getMessage(), QStringLiteral("Hello Ada Lovelace,\nsee you.\nMe Myself"));
 }
