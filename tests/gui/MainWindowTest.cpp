@@ -99,6 +99,13 @@ TEST_F(GuiFixture, BoldFormatsTheSelectionOrWhatIsTypedNext) {
     bold->trigger();
     QTest::keyClicks(editor, " at");
     EXPECT_EQ(pelmo->message()->toMarkdown(), "on **Saturday** at\n\n");
+    // The button shows the style where the cursor stands.
+    for (const int at : {5, 1}) {
+        QTextCursor cursor = editor->textCursor();
+        cursor.setPosition(at);
+        editor->setTextCursor(cursor);
+        EXPECT_EQ(bold->isChecked(), at == 5) << at;
+    }
     editor->selectAll();
     bold->trigger();
     EXPECT_EQ(pelmo->message()->toMarkdown(), "**on Saturday at**\n\n");

@@ -3,6 +3,7 @@
 #include "gui/PersonDialog.h"
 
 #include <QInputDialog>
+#include <QMenu>
 #include <QSignalSpy>
 #include <QTableWidget>
 
@@ -44,7 +45,8 @@ protected:
             dialog->setTextValue(reply);
             dialog->accept();
         } else if (auto* box = asked<QMessageBox>()) {
-            told = box->text();
+            // Return must never delete: the question's default is Cancel.
+            told = box->text() + (box->defaultButton()->text() == "Cancel" ? "" : " (no Cancel)");
             for (QAbstractButton* choice : box->buttons())
                 if (choice->text() == reply)
                     choice->click();
@@ -118,6 +120,25 @@ TEST_F(Picker, EditingGroupsAndPersonsAsksFirst) {
     clickRow(list("persons"), "Cy Cole");
     EXPECT_EQ(answer("deletePerson", "Delete"), "Delete \"Cy Cole\" from the address book?");
     EXPECT_EQ(rows("persons"), "Ann Able, Bob Baker");
+}
+
+// The membership menu offers every group, and leaving the group shown.
+TEST_F(Picker, MembershipMenu) {
+    auto* menu = child<QPushButton>("membership", &picker())->menu();
+    const auto offered = [menu] {
+        Q_EMIT menu->aboutToShow();
+        QStringList texts;
+        for (QAction* action : menu->actions())
+            texts << action->text();
+        return texts.join(", ");
+    };
+    clickRow(list("persons"), "Cy Cole");
+    EXPECT_EQ(offered(), "Add to \"Club\", Add to \"Family\"");
+    clickRow(list("groups"), "Club");
+    clickRow(list("persons"), "Bob Baker");
+    EXPECT_EQ(offered(), "Add to \"Club\", Add to \"Family\", , Remove from \"Club\"");
+    menu->actions().last()->trigger();
+    EXPECT_EQ(rows("persons"), "Ann Able");
 }
 
 TEST_F(Picker, ThePersonDialogSavesOnlyWhatTheBookTakes) {

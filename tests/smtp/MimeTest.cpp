@@ -79,8 +79,8 @@ struct Mail {
                 attach(field[0], raw[1] == "binary" ? binary() : raw[1]);
             else if (verb == "unreadable" &&
                      (!field[0].endsWith('/') || QDir(dir.path()).mkpath(field[0])))
-                EXPECT_FALSE(
-                    message.addAttachment(field[0].isEmpty() ? "" : dir.filePath(field[0])));
+                EXPECT_FALSE(message.addAttachment(
+                    field[0].isEmpty() ? "" : QDir(dir.path()).filePath(field[0])));
             else
                 ADD_FAILURE() << "cannot " << step.toStdString();
         }
