@@ -52,22 +52,16 @@ Certificates::Certificates(const QString& folder)
     : ca(folder + QStringLiteral("/ca.pem")), cert(folder + QStringLiteral("/server.pem")),
       key(folder + QStringLiteral("/server.key")) {
     QFile extensions(folder + QStringLiteral("/san.cnf"));
-    extensions.open(QIODevice::WriteOnly);
-    extensions.write("subjectAltName=DNS:localhost,IP:127.0.0.1\n");
+    ok = extensions.open(QIODevice::WriteOnly) &&
+         extensions.write("subjectAltName=DNS:localhost,IP:127.0.0.1\n") > 0;
     extensions.close();
-    ok =
-        openssl(QString("req -x509 -newkey rsa:2048 -nodes -days 2 -subj /CN=Pelmo-Test-CA -keyout "
-                        "ca.key -out ca.pem")
-                    .split(QLatin1Char(' ')),
-                folder) &&
-        openssl(QString("req -newkey rsa:2048 -nodes -subj /CN=localhost -keyout server.key -out "
-                        "server.csr")
-                    .split(QLatin1Char(' ')),
-                folder) &&
-        openssl(QString("x509 -req -in server.csr -CA ca.pem -CAkey ca.key -CAcreateserial -days 2 "
-                        "-extfile san.cnf -out server.pem")
-                    .split(QLatin1Char(' ')),
-                folder);
+    for (const char* step :
+         {"req -x509 -newkey rsa:2048 -nodes -days 2 -subj /CN=Pelmo-Test-CA -keyout ca.key -out "
+          "ca.pem",
+          "req -newkey rsa:2048 -nodes -subj /CN=localhost -keyout server.key -out server.csr",
+          "x509 -req -in server.csr -CA ca.pem -CAkey ca.key -CAcreateserial -days 2 -extfile "
+          "san.cnf -out server.pem"})
+        ok = ok && openssl(QString::fromLatin1(step).split(QLatin1Char(' ')), folder);
 }
 
 PelmoRun runPelmo(const QStringList& arguments, const QProcessEnvironment& environment) {
