@@ -1,0 +1,298 @@
+#include "util/CLog.h"
+#include "util/DataFolder.h"
+#include "util/LocalizedStrings.h"
+#include "util/PrivateFiles.h"
+#include "util/TextUtilities.h"
+
+#include "text/CString256.h"
+
+#include <QCoreApplication>
+#include <QDateTime>
+#include <QDesktopServices>
+#include <QFile>
+#include <QProcess>
+#include <QRegularExpression>
+#include <QTemporaryDir>
+#include <QTimeZone>
+#include <QTranslator>
+#include <QUrl>
+#include <gtest/gtest.h>
+
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+namespace {
+
+// The lines of a file of tests/data/util/, whose head tells their form.
+std::vector<std::string> rows(const char* file) {
+    QFile data(QStringLiteral(PELMO_TEST_DATA "/util/") + QLatin1String(file));
+    EXPECT_TRUE(data.open(QIODevice::ReadOnly));
+    std::vector<std::string> lines;
+    for (const QByteArray& line : data.readAll().split('\n'))
+        if (!line.isEmpty() && !line.startsWith('#'))
+            lines.push_back(line.toStdString());
+    return lines;
+}
+
+std::string rowName(const ::testing::TestParamInfo<std::string>& row) {
+    return row.param.substr(0, row.param.find(' '));
+}
+
+QString encoded(void (*encode)(char*, unsigned char), const QByteArray& bytes) {
+    QString text;
+    for (const char byte : bytes) {
+        char out[4];
+        encode(out, static_cast<unsigned char>(byte));
+        text += QString::fromLatin1(out);
+    }
+    return text;
+}
+
+QString owned(char* text) {
+    const QString copy = QString::fromLatin1(text);
+    delete[] text;
+    return copy;
+}
+
+QString made(const QString& function, const QStringList& args) {
+    const QString a = args.value(0), b = args.value(1);
+    char out[64];
+    std::memset(out, 'Z', sizeof out);
+    if (function == "reverse") {
+        std::strcpy(out, a.toLatin1().constData());
+        reverse(out);
+    } else if (function == "itoa") {
+        itoa(out, a.toShort(), b.toLong());
+    } else if (function == "newitoa") {
+        return owned(a == "unsigned" ? itoa(b.toULong())
+                     : a == "long"   ? itoa(b.toLong())
+                                     : itoa(b.toShort()));
+    } else if (function == "class") {
+        bool (*const in)(unsigned char) =
+            a == "upper"         ? isHiAlpha
+            : a == "lower"       ? isLoAlpha
+            : a == "letter"      ? isHiorLoAlpha
+            : a == "digit"       ? isDig
+            : a == "safe"        ? isSafe
+            : a == "extra"       ? isExtra
+            : a == "reserved"    ? isReserved
+            : a == "punctuation" ? isPunctuation
+            : a == "national"    ? isNational
+                                 : +[](unsigned char c) { return !NeedsURLEncoding(c); };
+        QString bytes;
+        for (int c = 0; c < 256; ++c)
+            bytes += in(static_cast<unsigned char>(c)) ? QString(QChar(c)) : QString();
+        return bytes;
+    } else if (function == "urlencode" || function == "urlsafe") {
+        return encoded(function == "urlencode" ? URLencode : URLSafeEncode,
+                       QByteArray::fromHex(a.toLatin1()));
+    } else if (function == "elapsed") {
+        CString256 text("took ");
+        ElapsedTimeMessage(a.toUInt(), text);
+        return QString::fromLatin1(text.c_str());
+    } else if (function == "move") {
+        QStringList list = {"a", "b", "c", "d"};
+        MoveArrayItem(list, a.toLongLong(), b.toLongLong());
+        return list.join(QString());
+    } else if (function == "mime") {
+        return MimeTypeForPath(a).isNull() ? "(none)" : MimeTypeForPath(a);
+    } else if (function == "date") {
+        return DateDescription(
+            QDateTime(QDate(2024, 5, 1), QTime(14, 3, 22), QTimeZone(a.toInt())));
+    } else if (function == "utf8") {
+        const QString text = DecodeUtf8Strictly(QByteArray::fromHex(a.toLatin1()));
+        return text.isNull() ? "(not UTF-8)" : text;
+    } else if (function == "format") {
+        return LocalizedFormat(a.toUtf8().constData(), args.mid(1));
+    }
+    return QString::fromLatin1(out);
+}
+
+class Texts : public ::testing::TestWithParam<std::string> {};
+
+TEST_P(Texts, Made) {
+    const QString line = QString::fromStdString(GetParam());
+    const QStringList words = QProcess::splitCommand(line.section(" => ", 0, 0));
+    const QString expected = line.section(" => ", 1);
+    const bool quoted = expected.size() > 1 && expected.startsWith('"') && expected.endsWith('"');
+    EXPECT_EQ(made(words.value(1), words.mid(2)).toStdString(),
+              (quoted ? expected.mid(1, expected.size() - 2) : expected).toStdString());
+}
+
+INSTANTIATE_TEST_SUITE_P(Util, Texts, ::testing::ValuesIn(rows("texts.txt")), rowName);
+
+// The only entry a translator into French has.
+class French : public QTranslator {
+public:
+    mutable int asked = 0;
+    QString translate(const char* context, const char* key, const char*, int) const override {
+        ++asked;
+        return QByteArray(context) + ':' + key == "LocalizedStrings:Sending message"
+                   ? QStringLiteral("Envoi du message")
+                   : QString();
+    }
+    bool isEmpty() const override { return false; }
+};
+
+// Each key is translated once, so translators come first; a key none has is its own text.
+TEST(LocalizedStrings, TranslatedOnce) {
+    French french;
+    QCoreApplication::installTranslator(&french);
+    EXPECT_EQ(LocalizedString("Sending message") + LocalizedStringNS("Caf\xc3\xa9 %@"),
+              "Envoi du messageCafé %@");
+    const int asked = french.asked;
+    EXPECT_EQ(LocalizedString(QStringLiteral("Sending message")) +
+                  LocalizedString("Caf\xc3\xa9 %@"),
+              "Envoi du messageCafé %@");
+    QCoreApplication::removeTranslator(&french);
+    EXPECT_EQ(LocalizedString("Sending message"), "Envoi du message");
+    EXPECT_EQ(french.asked, asked);
+}
+
+// A data home of its own, with no umask to narrow the modes asked for.
+class Home : public ::testing::Test {
+protected:
+    void SetUp() override {
+        ASSERT_TRUE(home.isValid());
+        saved = qgetenv("XDG_DATA_HOME");
+        qputenv("XDG_DATA_HOME", home.path().toUtf8());
+        savedMask = ::umask(0);
+    }
+    void TearDown() override {
+        StopLogging();
+        ::umask(savedMask);
+        qputenv("XDG_DATA_HOME", saved);
+    }
+    // "@" stands for the data folder's parent, "Orvale Software".
+    std::string at(QString path) const {
+        return (home.path() + '/' + path.trimmed().replace('@', "Orvale Software")).toStdString();
+    }
+
+    QTemporaryDir home;
+    QByteArray saved;
+    mode_t savedMask = 0;
+};
+
+class Log : public Home {};
+
+TEST_F(Log, RunsAreAppendedBetweenMarkers) {
+    StartLogging();
+    StartLogging(); // closes the first log, stop marker included
+    for (const std::string& line :
+         {std::string(254, 'a'), std::string(255, 'b'), std::string(300, 'c'), std::string("end"),
+          std::string("two\nparts caf\xc3\xa9")})
+        LogEntry(line.c_str());
+    StopLogging();
+    LogEntry("dropped");
+    StartLogging();
+    LogEntry("second run");
+    StopLogging();
+    QFile log(QString::fromStdString(at("@/Pelmo/Pelmo.log")));
+    ASSERT_TRUE(log.open(QIODevice::ReadOnly));
+    // A line is held in 255 bytes: at 255 it has no room left for its carriage return.
+    EXPECT_EQ(
+        QString::fromUtf8(log.readAll())
+            .replace(QRegularExpression(R"(\d{4}-\d\d-\d\d \d\d:\d\d:\d\d [+-]\d{4})"), "DATE")
+            .toStdString(),
+        "[Logging starting at DATE]\r[Logging stopping at DATE]\r[Logging starting at DATE]\r" +
+            std::string(254, 'a') + '\r' + std::string(255, 'b') + std::string(255, 'c') +
+            "end\rtwo\nparts caf\xc3\xa9\r[Logging stopping at DATE]\r"
+            "[Logging starting at DATE]\rsecond run\r[Logging stopping at DATE]\r");
+}
+
+// Stands in for the desktop's "open in the default application".
+class Opener : public QObject {
+    Q_OBJECT
+public:
+    QList<QUrl> opened;
+public Q_SLOTS:
+    void open(const QUrl& url) { opened << url; }
+};
+
+TEST_F(Log, ConsoleShowsTheLogOnceThereIsOne) {
+    Opener opener;
+    QDesktopServices::setUrlHandler("file", &opener, "open");
+    OpenConsole();
+    StartLogging();
+    OpenConsole();
+    QDesktopServices::unsetUrlHandler("file");
+    EXPECT_EQ(opener.opened,
+              QList<QUrl>{QUrl::fromLocalFile(QString::fromStdString(at("@/Pelmo/Pelmo.log")))});
+}
+
+TEST_F(Log, NoFolderNoLog) {
+    ASSERT_TRUE(QFile(QString::fromStdString(at("@"))).open(QIODevice::WriteOnly)); // in the way
+    StartLogging();
+    EXPECT_EQ(gLogger, nullptr);
+    LogEntry("nowhere");
+    CLog unopened;
+    EXPECT_EQ(unopened.open_log_file(at("none/Pelmo.log").c_str()), ENOENT);
+    EXPECT_FALSE(unopened.is_open());
+    EXPECT_EQ(unopened.write_entry(CString256("ignored")) + unopened.close_log_file(), 0);
+}
+
+// MakePrivateFile by a user who owns nothing here (root reads any file).
+bool privateFileAsNobody(const std::string& path) {
+    if (::geteuid() != 0)
+        return MakePrivateFile(path);
+    ::chmod(std::filesystem::path(path).parent_path().c_str(), 0755);
+    const pid_t child = ::fork();
+    if (child == 0)
+        ::_exit(::setgid(65534) == 0 && ::setuid(65534) == 0 && MakePrivateFile(path) ? 0 : 1);
+    int status = 0;
+    return ::waitpid(child, &status, 0) == child && WIFEXITED(status) && WEXITSTATUS(status) == 0;
+}
+
+class Modes : public Home, public ::testing::WithParamInterface<std::string> {};
+
+TEST_P(Modes, Private) {
+    const QStringList row = QString::fromStdString(GetParam()).split(" | ");
+    ASSERT_EQ(row.size(), 5);
+    QStringList files;
+    for (const QString& item : row[1].split(", ", Qt::SkipEmptyParts)) {
+        const QString kind = item.section(' ', 0, 0), spec = item.section(' ', 1);
+        const std::string path = at(spec.section(QRegularExpression("=|->"), 0, 0));
+        const mode_t mode = spec.section('=', 1).toUInt(nullptr, 8);
+        if (kind == "file") {
+            QFile file(QString::fromStdString(path));
+            ASSERT_TRUE(file.open(QIODevice::WriteOnly) && file.write("kept") == 4) << path;
+            files << (mode & S_IRUSR ? file.fileName() : QString());
+        }
+        ASSERT_EQ(kind == "link"
+                      ? ::symlink(spec.section("->", 1).toLatin1().constData(), path.c_str())
+                  : kind == "dir"  ? ::mkdir(path.c_str(), mode)
+                  : kind == "fifo" ? ::mkfifo(path.c_str(), mode)
+                                   : ::chmod(path.c_str(), mode),
+                  0)
+            << path;
+    }
+    const QString act = row[2].section(' ', 0, 0);
+    const std::string on = at(row[2].section(' ', 1));
+    std::filesystem::path folder;
+    const bool done = act == "folder"  ? GetOurApplicationSupportFolder(folder)
+                      : act == "log"   ? (StartLogging(), gLogger && gLogger->is_open())
+                      : act == "mkdir" ? MakePrivateFolder(on)
+                      : act == "file"  ? MakePrivateFile(on)
+                                       : privateFileAsNobody(on);
+    EXPECT_EQ(done ? "done" : "refused", row[3]);
+    EXPECT_EQ(folder.string(), act == "folder" ? at("@/Pelmo") : "");
+    for (const QString& item : row[4].split(", ")) {
+        struct stat status {};
+        const bool there = ::stat(at(item.section('=', 0, 0)).c_str(), &status) == 0;
+        EXPECT_EQ((there ? QString::number(status.st_mode & 07777, 8) : "-").toStdString(),
+                  item.section('=', 1).toStdString());
+    }
+    files.removeAll(QString());
+    for (const QString& path : files) { // no file loses its content
+        QFile file(path);
+        EXPECT_TRUE(file.open(QIODevice::ReadOnly) && file.readAll().startsWith("kept"))
+            << path.toStdString();
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(Files, Modes, ::testing::ValuesIn(rows("privacy.txt")), rowName);
+
+} // namespace
+
+#include "UtilTest.moc"
