@@ -26,7 +26,7 @@ QString outline(const QByteArray& bytes) {
     QStringList lines = {"From: " + message.from, "To: " + message.to,
                          "Subject: " + message.subject, message.topType};
     for (const ReceivedPart& part : message.parts)
-        lines << QStringLiteral("  %1 %2 %3%4: %5")
+        lines << QStringLiteral("  %1 %2 %3%4: \"%5\"")
                      .arg(
                          part.mimeType, part.charset, part.encoding,
                          part.filename.isEmpty() ? QString() : ' ' + part.filename,
@@ -34,9 +34,9 @@ QString outline(const QByteArray& bytes) {
     return lines.join('\n');
 }
 
-class Session {
+class Terminal {
 public:
-    Session() {
+    Terminal() {
         environment.insert("XDG_DATA_HOME", home.filePath("data"));
         environment.insert("XDG_CONFIG_HOME", home.filePath("config"));
         environment.insert("XDG_RUNTIME_DIR", home.path()); // private, as Qt wants it
@@ -49,7 +49,6 @@ public:
         const QString& what = words.value(words.value(0) == "$" ? 1 : 0);
         QString out;
         if (what == "server") {
-            server.reset();
             server =
                 std::make_unique<ServerProcess>(PELMO_TEST_DATA "/../" + words[1], words.mid(2));
             EXPECT_NE(server->port(), 0);
@@ -67,9 +66,8 @@ public:
             for (const QByteArray& record : server->records())
                 out += outline(messageOf(record)) + '\n';
         } else if (what == "eml") {
-            out = outline(bytes(words[2]));
-        } else if (what == "ls") {
-            out = QDir(words[2]).entryList(QDir::Files, QDir::Name).join('\n');
+            for (const QString& name : QDir(words[2]).entryList(QDir::Files, QDir::Name))
+                out += name + '\n' + outline(bytes(words[2] + '/' + name)) + '\n';
         } else if (what == "log") {
             out = QString::fromUtf8(bytes(home.filePath("data/Orvale Software/Pelmo/Pelmo.log")));
             EXPECT_FALSE(out.contains('\n')) << "log lines end in a carriage return";
@@ -103,26 +101,26 @@ private:
 
 } // namespace
 
-std::vector<std::string> sessionNames(const QString& file) {
-    std::vector<std::string> names;
+std::vector<Session> sessionsOf(const QString& file) {
+    std::vector<Session> names;
     static const QRegularExpression header("^== (\\w+)$", QRegularExpression::MultilineOption);
     for (const QRegularExpressionMatch& match : header.globalMatch(cli(file)))
-        names.push_back(match.captured(1).toStdString());
+        names.push_back({match.captured(1).toStdString()});
     return names;
 }
 
-Played playSession(const QString& file, const std::string& name) {
+void playSession(const QString& file, const std::string& name) {
     const QString written = cli(file)
                                 .section(QString::fromStdString("\n== " + name + '\n'), 1)
                                 .section("\n== ", 0, 0)
                                 .trimmed();
-    Session session;
+    Terminal terminal;
     QStringList played;
     static const QRegularExpression command("^(\\$ |server |env |#)");
     for (const QString& line : written.split('\n')) {
         if (command.match(line).hasMatch()) // the rest is what the line above printed
-            played << line << (line.startsWith('#') ? QString() : session.play(line));
+            played << line << (line.startsWith('#') ? QString() : terminal.play(line));
     }
     played.removeAll(QString());
-    return {written.toStdString(), played.join('\n').toStdString()};
+    EXPECT_EQ(played.join('\n').toStdString(), written.toStdString());
 }
