@@ -18,42 +18,43 @@
 #include <QUrl>
 #include <gtest/gtest.h>
 
+#include <memory>
+
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 namespace {
 
-// The lines of a file of tests/data/util/, whose head tells their form.
-std::vector<std::string> rows(const char* file) {
+// The lines of a file of tests/data/util/, whose head tells their form, by the names they start
+// with.
+struct Row {
+    std::string name, line;
+};
+void PrintTo(const Row& row, std::ostream* out) {
+    *out << row.name;
+}
+
+std::vector<Row> rows(const char* file) {
     QFile data(QStringLiteral(PELMO_TEST_DATA "/util/") + QLatin1String(file));
     EXPECT_TRUE(data.open(QIODevice::ReadOnly));
-    std::vector<std::string> lines;
+    std::vector<Row> lines;
     for (const QByteArray& line : data.readAll().split('\n'))
         if (!line.isEmpty() && !line.startsWith('#'))
-            lines.push_back(line.toStdString());
+            lines.push_back({line.left(line.indexOf(' ')).toStdString(), line.toStdString()});
     return lines;
 }
 
-std::string rowName(const ::testing::TestParamInfo<std::string>& row) {
-    return row.param.substr(0, row.param.find(' '));
-}
-
-QString encoded(void (*encode)(char*, unsigned char), const QByteArray& bytes) {
-    QString text;
-    for (const char byte : bytes) {
-        char out[4];
-        encode(out, static_cast<unsigned char>(byte));
-        text += QString::fromLatin1(out);
+// The only entry a translator into French has.
+class French : public QTranslator {
+public:
+    QString translate(const char* context, const char* key, const char*, int) const override {
+        return QByteArray(context) + ':' + key == "LocalizedStrings:Sending message"
+                   ? QStringLiteral("Envoi du message")
+                   : QString();
     }
-    return text;
-}
-
-QString owned(char* text) {
-    const QString copy = QString::fromLatin1(text);
-    delete[] text;
-    return copy;
-}
+    bool isEmpty() const override { return false; }
+};
 
 QString made(const QString& function, const QStringList& args) {
     const QString a = args.value(0), b = args.value(1);
@@ -65,28 +66,33 @@ QString made(const QString& function, const QStringList& args) {
     } else if (function == "itoa") {
         itoa(out, a.toShort(), b.toLong());
     } else if (function == "newitoa") {
-        return owned(a == "unsigned" ? itoa(b.toULong())
-                     : a == "long"   ? itoa(b.toLong())
-                                     : itoa(b.toShort()));
+        const std::unique_ptr<char[]> text(a == "unsigned" ? itoa(b.toULong())
+                                           : a == "long"   ? itoa(b.toLong())
+                                                           : itoa(b.toShort()));
+        return QString::fromLatin1(text.get());
     } else if (function == "class") {
-        bool (*const in)(unsigned char) =
-            a == "upper"         ? isHiAlpha
-            : a == "lower"       ? isLoAlpha
-            : a == "letter"      ? isHiorLoAlpha
-            : a == "digit"       ? isDig
-            : a == "safe"        ? isSafe
-            : a == "extra"       ? isExtra
-            : a == "reserved"    ? isReserved
-            : a == "punctuation" ? isPunctuation
-            : a == "national"    ? isNational
-                                 : +[](unsigned char c) { return !NeedsURLEncoding(c); };
+        const qsizetype k = QString("upper lower letter digit safe extra reserved punctuation "
+                                    "national")
+                                .split(' ')
+                                .indexOf(a);
+        bool (*const classes[])(unsigned char) = {isHiAlpha,  isLoAlpha,     isHiorLoAlpha,
+                                                  isDig,      isSafe,        isExtra,
+                                                  isReserved, isPunctuation, isNational};
         QString bytes;
-        for (int c = 0; c < 256; ++c)
-            bytes += in(static_cast<unsigned char>(c)) ? QString(QChar(c)) : QString();
+        for (int c = 0; c < 256; ++c) {
+            const auto byte = static_cast<unsigned char>(c);
+            if (k >= 0 ? classes[k](byte) : !NeedsURLEncoding(byte))
+                bytes += QChar(c);
+        }
         return bytes;
     } else if (function == "urlencode" || function == "urlsafe") {
-        return encoded(function == "urlencode" ? URLencode : URLSafeEncode,
-                       QByteArray::fromHex(a.toLatin1()));
+        QString text;
+        for (const char byte : QByteArray::fromHex(a.toLatin1())) {
+            (function == "urlencode" ? URLencode : URLSafeEncode)(out,
+                                                                  static_cast<unsigned char>(byte));
+            text += QString::fromLatin1(out);
+        }
+        return text;
     } else if (function == "elapsed") {
         CString256 text("took ");
         ElapsedTimeMessage(a.toUInt(), text);
@@ -105,14 +111,20 @@ QString made(const QString& function, const QStringList& args) {
         return text.isNull() ? "(not UTF-8)" : text;
     } else if (function == "format") {
         return LocalizedFormat(a.toUtf8().constData(), args.mid(1));
+    } else if (function == "french") {
+        French french;
+        QCoreApplication::installTranslator(&french);
+        const QString translated = LocalizedString(a);
+        QCoreApplication::removeTranslator(&french);
+        return translated + " / " + LocalizedString(a);
     }
     return QString::fromLatin1(out);
 }
 
-class Texts : public ::testing::TestWithParam<std::string> {};
+class Texts : public ::testing::TestWithParam<Row> {};
 
 TEST_P(Texts, Made) {
-    const QString line = QString::fromStdString(GetParam());
+    const QString line = QString::fromStdString(GetParam().line);
     const QStringList words = QProcess::splitCommand(line.section(" => ", 0, 0));
     const QString expected = line.section(" => ", 1);
     const bool quoted = expected.size() > 1 && expected.startsWith('"') && expected.endsWith('"');
@@ -120,35 +132,7 @@ TEST_P(Texts, Made) {
               (quoted ? expected.mid(1, expected.size() - 2) : expected).toStdString());
 }
 
-INSTANTIATE_TEST_SUITE_P(Util, Texts, ::testing::ValuesIn(rows("texts.txt")), rowName);
-
-// The only entry a translator into French has.
-class French : public QTranslator {
-public:
-    mutable int asked = 0;
-    QString translate(const char* context, const char* key, const char*, int) const override {
-        ++asked;
-        return QByteArray(context) + ':' + key == "LocalizedStrings:Sending message"
-                   ? QStringLiteral("Envoi du message")
-                   : QString();
-    }
-    bool isEmpty() const override { return false; }
-};
-
-// Each key is translated once, so translators come first; a key none has is its own text.
-TEST(LocalizedStrings, TranslatedOnce) {
-    French french;
-    QCoreApplication::installTranslator(&french);
-    EXPECT_EQ(LocalizedString("Sending message") + LocalizedStringNS("Caf\xc3\xa9 %@"),
-              "Envoi du messageCafé %@");
-    const int asked = french.asked;
-    EXPECT_EQ(LocalizedString(QStringLiteral("Sending message")) +
-                  LocalizedString("Caf\xc3\xa9 %@"),
-              "Envoi du messageCafé %@");
-    QCoreApplication::removeTranslator(&french);
-    EXPECT_EQ(LocalizedString("Sending message"), "Envoi du message");
-    EXPECT_EQ(french.asked, asked);
-}
+INSTANTIATE_TEST_SUITE_P(Util, Texts, ::testing::ValuesIn(rows("texts.txt")));
 
 // A data home of its own, with no umask to narrow the modes asked for.
 class Home : public ::testing::Test {
@@ -174,9 +158,22 @@ protected:
     mode_t savedMask = 0;
 };
 
+// Stands in for the desktop's "open in the default application".
+class Opener : public QObject {
+    Q_OBJECT
+public:
+    QList<QUrl> opened;
+public Q_SLOTS:
+    void open(const QUrl& url) { opened << url; }
+};
+
 class Log : public Home {};
 
-TEST_F(Log, RunsAreAppendedBetweenMarkers) {
+// The console shows the log once there is one.
+TEST_F(Log, RunsAppendedAndShown) {
+    Opener opener;
+    QDesktopServices::setUrlHandler("file", &opener, "open");
+    OpenConsole();
     StartLogging();
     StartLogging(); // closes the first log, stop marker included
     for (const std::string& line :
@@ -188,7 +185,10 @@ TEST_F(Log, RunsAreAppendedBetweenMarkers) {
     StartLogging();
     LogEntry("second run");
     StopLogging();
+    OpenConsole();
+    QDesktopServices::unsetUrlHandler("file");
     QFile log(QString::fromStdString(at("@/Pelmo/Pelmo.log")));
+    EXPECT_EQ(opener.opened, QList<QUrl>{QUrl::fromLocalFile(log.fileName())});
     ASSERT_TRUE(log.open(QIODevice::ReadOnly));
     // A line is held in 255 bytes: at 255 it has no room left for its carriage return.
     EXPECT_EQ(
@@ -199,37 +199,6 @@ TEST_F(Log, RunsAreAppendedBetweenMarkers) {
             std::string(254, 'a') + '\r' + std::string(255, 'b') + std::string(255, 'c') +
             "end\rtwo\nparts caf\xc3\xa9\r[Logging stopping at DATE]\r"
             "[Logging starting at DATE]\rsecond run\r[Logging stopping at DATE]\r");
-}
-
-// Stands in for the desktop's "open in the default application".
-class Opener : public QObject {
-    Q_OBJECT
-public:
-    QList<QUrl> opened;
-public Q_SLOTS:
-    void open(const QUrl& url) { opened << url; }
-};
-
-TEST_F(Log, ConsoleShowsTheLogOnceThereIsOne) {
-    Opener opener;
-    QDesktopServices::setUrlHandler("file", &opener, "open");
-    OpenConsole();
-    StartLogging();
-    OpenConsole();
-    QDesktopServices::unsetUrlHandler("file");
-    EXPECT_EQ(opener.opened,
-              QList<QUrl>{QUrl::fromLocalFile(QString::fromStdString(at("@/Pelmo/Pelmo.log")))});
-}
-
-TEST_F(Log, NoFolderNoLog) {
-    ASSERT_TRUE(QFile(QString::fromStdString(at("@"))).open(QIODevice::WriteOnly)); // in the way
-    StartLogging();
-    EXPECT_EQ(gLogger, nullptr);
-    LogEntry("nowhere");
-    CLog unopened;
-    EXPECT_EQ(unopened.open_log_file(at("none/Pelmo.log").c_str()), ENOENT);
-    EXPECT_FALSE(unopened.is_open());
-    EXPECT_EQ(unopened.write_entry(CString256("ignored")) + unopened.close_log_file(), 0);
 }
 
 // MakePrivateFile by a user who owns nothing here (root reads any file).
@@ -244,29 +213,17 @@ bool privateFileAsNobody(const std::string& path) {
     return ::waitpid(child, &status, 0) == child && WIFEXITED(status) && WEXITSTATUS(status) == 0;
 }
 
-class Modes : public Home, public ::testing::WithParamInterface<std::string> {};
+class Modes : public Home, public ::testing::WithParamInterface<Row> {};
 
 TEST_P(Modes, Private) {
-    const QStringList row = QString::fromStdString(GetParam()).split(" | ");
+    const QStringList row = QString::fromStdString(GetParam().line).split(" | ");
     ASSERT_EQ(row.size(), 5);
-    QStringList files;
-    for (const QString& item : row[1].split(", ", Qt::SkipEmptyParts)) {
-        const QString kind = item.section(' ', 0, 0), spec = item.section(' ', 1);
-        const std::string path = at(spec.section(QRegularExpression("=|->"), 0, 0));
-        const mode_t mode = spec.section('=', 1).toUInt(nullptr, 8);
-        if (kind == "file") {
-            QFile file(QString::fromStdString(path));
-            ASSERT_TRUE(file.open(QIODevice::WriteOnly) && file.write("kept") == 4) << path;
-            files << (mode & S_IRUSR ? file.fileName() : QString());
-        }
-        ASSERT_EQ(kind == "link"
-                      ? ::symlink(spec.section("->", 1).toLatin1().constData(), path.c_str())
-                  : kind == "dir"  ? ::mkdir(path.c_str(), mode)
-                  : kind == "fifo" ? ::mkfifo(path.c_str(), mode)
-                                   : ::chmod(path.c_str(), mode),
-                  0)
-            << path;
-    }
+    ASSERT_EQ(QProcess::execute("sh", {"-c",
+                                       "cd \"$0\" && kept() { printf kept >\"$1\" && chmod \"$2\" "
+                                       "\"$1\" && echo \"$1\" >>.kept; }\n" +
+                                           QString(row[1]).replace('@', "'Orvale Software'"),
+                                       home.path()}),
+              0);
     const QString act = row[2].section(' ', 0, 0);
     const std::string on = at(row[2].section(' ', 1));
     std::filesystem::path folder;
@@ -276,22 +233,24 @@ TEST_P(Modes, Private) {
                       : act == "file"  ? MakePrivateFile(on)
                                        : privateFileAsNobody(on);
     EXPECT_EQ(done ? "done" : "refused", row[3]);
-    EXPECT_EQ(folder.string(), act == "folder" ? at("@/Pelmo") : "");
+    EXPECT_EQ(folder.string(), act == "folder" && done ? at("@/Pelmo") : "");
     for (const QString& item : row[4].split(", ")) {
         struct stat status {};
         const bool there = ::stat(at(item.section('=', 0, 0)).c_str(), &status) == 0;
         EXPECT_EQ((there ? QString::number(status.st_mode & 07777, 8) : "-").toStdString(),
                   item.section('=', 1).toStdString());
     }
-    files.removeAll(QString());
-    for (const QString& path : files) { // no file loses its content
-        QFile file(path);
-        EXPECT_TRUE(file.open(QIODevice::ReadOnly) && file.readAll().startsWith("kept"))
-            << path.toStdString();
+    QFile kept(home.filePath(".kept"));
+    for (const QByteArray& path :
+         kept.open(QIODevice::ReadOnly) ? kept.readAll().split('\n') : QList<QByteArray>()) {
+        QFile file(home.filePath(QString::fromUtf8(path)));
+        EXPECT_TRUE(path.isEmpty() ||
+                    (file.open(QIODevice::ReadOnly) && file.readAll().startsWith("kept")))
+            << path.constData() << " lost its content";
     }
 }
 
-INSTANTIATE_TEST_SUITE_P(Files, Modes, ::testing::ValuesIn(rows("privacy.txt")), rowName);
+INSTANTIATE_TEST_SUITE_P(Files, Modes, ::testing::ValuesIn(rows("privacy.txt")));
 
 } // namespace
 
