@@ -26,8 +26,7 @@
 
 namespace {
 
-// The lines of a file of tests/data/util/, whose head tells their form, by the names they start
-// with.
+// The rows of a file of tests/data/util/, whose head tells their form, named by their first word.
 struct Row {
     std::string name, line;
 };
@@ -173,6 +172,7 @@ class Log : public Home {};
 TEST_F(Log, RunsAppendedAndShown) {
     Opener opener;
     QDesktopServices::setUrlHandler("file", &opener, "open");
+    LogEntry("before"); // makes no file
     OpenConsole();
     StartLogging();
     StartLogging(); // closes the first log, stop marker included
