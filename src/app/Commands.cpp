@@ -1,5 +1,6 @@
 #include "app/Commands.h"
 
+#include <QCoreApplication>
 #include <QTextStream>
 
 #include <cstdio>
@@ -30,13 +31,25 @@ const std::vector<Command> kCommands = {
 } // namespace
 
 QString usage() {
-    QString text = QStringLiteral("usage:\n");
+    QString text = QStringLiteral("usage:\n"
+                                  "  pelmo                               open the window\n");
     for (const Command& command : kCommands)
         text += QStringLiteral("  ") + QString::fromUtf8(command.synopsis) + QLatin1Char('\n');
-    return text;
+    return text +
+           QStringLiteral("  pelmo --help | --version            this text, or the version\n");
 }
 
 int run(const QStringList& args) {
+    // Asked for, the usage and the version are the answer and go to standard output.
+    if (args.size() == 1 &&
+        (args.first() == QLatin1String("--help") || args.first() == QLatin1String("-h"))) {
+        QTextStream(stdout) << usage();
+        return 0;
+    }
+    if (args.size() == 1 && args.first() == QLatin1String("--version")) {
+        QTextStream(stdout) << "pelmo " << QCoreApplication::applicationVersion() << '\n';
+        return 0;
+    }
     if (!args.isEmpty()) {
         for (const Command& command : kCommands) {
             if (args.first() == QLatin1String(command.name))

@@ -20,9 +20,11 @@ int fail(const QString& message) {
     return 1;
 }
 
+constexpr char kUsage[] = "usage:\n  pelmo contacts import FILE\n"
+                          "  pelmo contacts list [--group NAME]\n";
+
 int contactsUsage() {
-    QTextStream(stderr) << "usage:\n  pelmo contacts import FILE\n"
-                           "  pelmo contacts list [--group NAME]\n";
+    QTextStream(stderr) << kUsage;
     return 2;
 }
 
@@ -88,6 +90,10 @@ int listContacts(const QString& groupName, bool byGroup) {
 } // namespace
 
 int contacts(const QStringList& args) {
+    if (args == QStringList{QStringLiteral("--help")}) {
+        QTextStream(stdout) << kUsage;
+        return 0;
+    }
     try {
         if (args.size() == 2 && args.at(0) == QLatin1String("import"))
             return importContacts(args.at(1));

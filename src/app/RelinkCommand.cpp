@@ -30,6 +30,10 @@ bool readPage(const QString& path, QByteArray& bytes) {
 } // namespace
 
 int relink(const QStringList& args) {
+    if (args == QStringList{QStringLiteral("--help")}) {
+        QTextStream(stdout) << "usage: pelmo relink BASE-URL [FILE]\n";
+        return 0;
+    }
     if (args.isEmpty() || args.size() > 2 || args.first().startsWith(QLatin1Char('-'))) {
         QTextStream(stderr) << "usage: pelmo relink BASE-URL [FILE]\n";
         return 2;

@@ -1,209 +1,228 @@
 #include "addressbook/AddressBook.h"
+#include "addressbook/ContactsFile.h"
+#include "addressbook/CsvImporter.h"
+#include "addressbook/ImportError.h"
+#include "addressbook/VCardImporter.h"
 
-#include "util/PelmoException.h"
-
-#include "RowName.h"
-
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
+#include <QProcess>
 #include <QSqlDatabase>
 #include <QSqlQuery>
 #include <QTemporaryDir>
 #include <gtest/gtest.h>
 
-#include <fcntl.h>
 #include <sys/stat.h>
-#include <unistd.h>
 
-#include <memory>
-#include <string>
-
+// The cases of tests/data/import/cases.txt and tests/data/addressbook/changes.txt, whose heads
+// tell their form; a contact is written in both as first|last|addresses|groups.
 namespace {
 
-ImportedContact contact(const char* first, const char* last, QStringList emails,
-                        QStringList groups = {}) {
-    Person person;
-    person.firstName = first ? QString::fromUtf8(first) : QString();
-    person.lastName = last ? QString::fromUtf8(last) : QString();
-    person.emails = std::move(emails);
-    person.primary = person.emails.isEmpty() ? -1 : static_cast<int>(person.emails.size()) - 1;
-    return {person, std::move(groups)};
-}
-
-QStringList names(const QList<Person>& persons) {
-    QStringList list;
-    for (const Person& person : persons)
-        list << person.fullName();
-    return list;
-}
-
-class Book : public ::testing::Test {
-protected:
-    void SetUp() override {
-        ASSERT_TRUE(folder.isValid());
-        book = std::make_unique<AddressBook>(path());
-    }
-    QString path() const { return folder.filePath(QStringLiteral("AddressBook.sqlite")); }
-
-    QTemporaryDir folder;
-    std::unique_ptr<AddressBook> book;
-};
-
-TEST_F(Book, StoresPersonsWithTheirPrimaryAddress) {
-    const ImportSummary summary =
-        book->add({contact("Ada", "Lovelace", {"ada@work.example", "ada@example.org"}),
-                   contact("Cher", nullptr, {}), contact("Alan", "Turing", {"alan@example.org"})});
-    EXPECT_EQ(summary.personsAdded, 3);
-    EXPECT_EQ(summary.personsKnown, 0);
-    EXPECT_EQ(summary.groups, 0);
-    const QList<Person> persons = book->persons();
-    EXPECT_EQ(names(persons), QStringList({"Cher", "Ada Lovelace", "Alan Turing"}));
-    const Person& ada = persons.at(1);
-    EXPECT_EQ(ada.emails, QStringList({"ada@work.example", "ada@example.org"}));
-    EXPECT_EQ(ada.primaryEmail(), QStringLiteral("ada@example.org"));
-    const Person& cher = persons.at(0);
-    EXPECT_TRUE(cher.lastName.isNull());
-    EXPECT_TRUE(cher.primaryEmail().isNull());
-    EXPECT_EQ(book->person(ada.id)->emails, ada.emails);
-    EXPECT_FALSE(book->person(999999).has_value());
-}
-
-TEST_F(Book, GroupsKeepTheirMembersInOrder) {
-    book->add({contact("Grace", "Hopper", {"g@example.com"}, {"Friends"}),
-               contact("Ada", "Lovelace", {"a@example.org"}, {"friends", "Work"})});
-    book->add({contact("Alan", "Turing", {"t@example.org"}, {"FRIENDS"})});
-    const QList<Group> groups = book->groups();
-    ASSERT_EQ(groups.size(), 2);
-    EXPECT_EQ(groups.at(0).name, QStringLiteral("Friends"));
-    EXPECT_EQ(groups.at(1).name, QStringLiteral("Work"));
-    const std::optional<Group> friends = book->groupNamed(QStringLiteral("fRiEnDs"));
-    ASSERT_TRUE(friends.has_value());
-    EXPECT_EQ(names(*book->members(friends->id)),
-              QStringList({"Grace Hopper", "Ada Lovelace", "Alan Turing"}));
-    EXPECT_EQ(book->group(friends->id)->name, QStringLiteral("Friends"));
-    EXPECT_FALSE(book->members(999999).has_value());
-    EXPECT_FALSE(book->groupNamed(QStringLiteral("Nobody")).has_value());
-}
-
-TEST_F(Book, GroupNamesIgnoreCaseBeyondAscii) {
-    book->add({contact("A", "B", {"a@example.org"}, {QString::fromUtf8("Élèves")})});
-    EXPECT_TRUE(book->groupNamed(QString::fromUtf8("éLÈVES")).has_value());
-}
-
-TEST_F(Book, AKnownPersonIsNotAddedTwiceButJoinsNewGroups) {
-    book->add({contact("Ada", "Lovelace", {"ada@example.org"}, {"Friends"})});
-    const ImportSummary summary =
-        book->add({contact("Ada", "Lovelace", {"ADA@example.org"}, {"Friends", "Chess"}),
-                   contact("Ada", "Lovelace", {"other@example.org"}, {})});
-    EXPECT_EQ(summary.personsAdded, 1); // a different primary address is another person
-    EXPECT_EQ(summary.personsKnown, 1);
-    EXPECT_EQ(summary.groups, 2);
-    EXPECT_EQ(book->persons().size(), 2);
-    EXPECT_EQ(book->members(book->groupNamed(QStringLiteral("Friends"))->id)->size(), 1);
-    EXPECT_EQ(book->members(book->groupNamed(QStringLiteral("Chess"))->id)->size(), 1);
-}
-
-TEST_F(Book, KeptAcrossOpenings) {
-    book->add({contact("Ada", "Lovelace", {"ada@example.org"}, {"Friends"})});
-    book.reset();
-    AddressBook reopened(path());
-    EXPECT_EQ(names(reopened.persons()), QStringList({"Ada Lovelace"}));
-    AddressBook second(path()); // two connections on one file at once
-    EXPECT_EQ(second.groups().size(), 1);
-}
-
-// A failure in the middle of an import leaves nothing of it behind.
-TEST_F(Book, FailureHalfWayKeepsNothing) {
-    book->add({contact("Ada", "Lovelace", {"ada@example.org"}, {"Friends"})});
-    {
-        QSqlDatabase raw =
-            QSqlDatabase::addDatabase(QStringLiteral("QSQLITE"), QStringLiteral("raw"));
-        raw.setDatabaseName(path());
-        ASSERT_TRUE(raw.open());
-        QSqlQuery trigger(raw);
-        ASSERT_TRUE(trigger.exec(QStringLiteral(
-            "CREATE TRIGGER refuse BEFORE INSERT ON persons WHEN NEW.first_name = 'Boom' "
-            "BEGIN SELECT RAISE(ABORT, 'refused by the test'); END")));
-        raw.close();
-    }
-    QSqlDatabase::removeDatabase(QStringLiteral("raw"));
-    try {
-        book->add({contact("Alan", "Turing", {"alan@example.org"}, {"Friends", "New"}),
-                   contact("Boom", "Bang", {"boom@example.org"}, {"Friends"})});
-        ADD_FAILURE() << "the import went through";
-    } catch (const PelmoException& failure) {
-        EXPECT_EQ(failure.name(), QStringLiteral("AddressBookUnavailable"));
-        EXPECT_TRUE(failure.reason().contains(QStringLiteral("refused by the test")));
-    }
-    EXPECT_EQ(names(book->persons()), QStringList({"Ada Lovelace"}));
-    EXPECT_EQ(book->groups().size(), 1);
-    EXPECT_EQ(book->members(book->groupNamed(QStringLiteral("Friends"))->id)->size(), 1);
-}
-
-TEST(AddressBookFile, UnopenableFileIsANamedFailure) {
-    try {
-        AddressBook book(QStringLiteral("/nonexistent-folder/AddressBook.sqlite"));
-        ADD_FAILURE() << "opened";
-    } catch (const PelmoException& failure) {
-        EXPECT_EQ(failure.name(), QStringLiteral("AddressBookUnavailable"));
-        EXPECT_TRUE(failure.reason().contains(QStringLiteral("/nonexistent-folder/")));
-    }
-}
-
-struct BookFileRow {
+struct Case {
     std::string name;
-    bool inDataFolder; // or at a path in a 0755 folder of the user's
-    mode_t existing;   // the mode of an empty file already there; 0 for none
-    mode_t expected;
+    QString kind, input, expected;
 };
 
-class BookFile : public ::testing::TestWithParam<BookFileRow> {
-protected:
-    void SetUp() override {
-        ASSERT_TRUE(home.isValid());
-        saved = qgetenv("XDG_DATA_HOME");
-        qputenv("XDG_DATA_HOME", home.path().toUtf8());
-        // With no umask to narrow them, the modes seen are the ones the code asked for.
-        savedMask = ::umask(0);
-        ASSERT_EQ(::mkdir(given().c_str(), 0755), 0);
-    }
-    void TearDown() override {
-        ::umask(savedMask);
-        qputenv("XDG_DATA_HOME", saved);
-    }
-    std::string given() const { return home.path().toStdString() + "/given"; }
-
-    static mode_t modeOf(const std::string& path) {
-        struct stat status {};
-        return ::stat(path.c_str(), &status) == 0 ? status.st_mode & 07777 : 0;
-    }
-
-    QTemporaryDir home;
-    QByteArray saved;
-    mode_t savedMask = 0;
-};
-
-TEST_P(BookFile, Mode) {
-    const BookFileRow& row = GetParam();
-    const std::string path = given() + "/AddressBook.sqlite";
-    if (row.existing != 0) {
-        const int fd = ::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL, row.existing);
-        ASSERT_GE(fd, 0);
-        ::close(fd);
-    }
-    std::unique_ptr<AddressBook> book =
-        row.inDataFolder ? std::make_unique<AddressBook>()
-                         : std::make_unique<AddressBook>(QString::fromStdString(path));
-    book->add({contact("Ada", "Lovelace", {"ada@example.org"})});
-    EXPECT_EQ(modeOf(book->path().toStdString()), row.expected);
-    // A folder the book did not make is the user's to set.
-    EXPECT_EQ(modeOf(given()), mode_t(0755));
+void PrintTo(const Case& row, std::ostream* out) {
+    *out << row.name;
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    Modes, BookFile,
-    ::testing::Values(BookFileRow{"NewBookInTheDataFolderIs0600", true, 0, 0600},
-                      BookFileRow{"NewBookAtAPathIs0600", false, 0, 0600},
-                      // The user may share a book of their own on purpose.
-                      BookFileRow{"ExistingBookAtAPathKeepsItsMode", false, 0640, 0640}),
-    RowName());
+std::vector<Case> cases(const char* file) {
+    QFile data(QStringLiteral(PELMO_TEST_DATA "/") + QLatin1String(file));
+    EXPECT_TRUE(data.open(QIODevice::ReadOnly));
+    std::vector<Case> all;
+    for (const QString& block : QString::fromUtf8(data.readAll()).split("\n== ").mid(1)) {
+        const QString body = block.section('\n', 1);
+        const qsizetype cut = ('\n' + body).indexOf("\n--\n");
+        all.push_back({block.section(' ', 0, 0).section('\n', 0, 0).toStdString(),
+                       block.section('\n', 0, 0).section(' ', 1), body.left(cut),
+                       body.mid(cut + 3).trimmed()});
+    }
+    return all;
+}
+
+QString contactLine(const Person& person, const QStringList& groups) {
+    const auto nameOrTilde = [](const QString& part) { return part.isNull() ? "~" : part; };
+    QStringList addresses;
+    for (qsizetype i = 0; i < person.emails.size(); ++i)
+        addresses << (i == person.primary ? "*" : "") + person.emails[i];
+    if (person.emails.isEmpty() && person.primary != -1)
+        addresses << QStringLiteral("primary %1 of none").arg(person.primary);
+    return QStringList{nameOrTilde(person.firstName), nameOrTilde(person.lastName),
+                       addresses.join(';'), groups.join(';')}
+        .join('|');
+}
+
+ImportedContact contactOf(const QString& line) {
+    const QStringList parts = line.split('|');
+    const auto name = [](const QString& part) { return part == "~" ? QString() : part; };
+    ImportedContact contact{{0, name(parts[0]), name(parts.value(1)), {}, -1},
+                            parts.value(3).split(';', Qt::SkipEmptyParts)};
+    for (const QString& address : parts.value(2).split(';', Qt::SkipEmptyParts)) {
+        if (address.startsWith('*'))
+            contact.person.primary = static_cast<int>(contact.person.emails.size());
+        if (address != "*") // alone, a primary past the addresses
+            contact.person.emails << address.mid(address.startsWith('*') ? 1 : 0);
+    }
+    return contact;
+}
+
+// The case's text as bytes: "\r", "\n", "\t", "\\" and "\xHH" are those bytes, "\c" drops the line
+// end.
+QByteArray unescaped(const QString& text) {
+    const QByteArray in = text.toUtf8();
+    QByteArray bytes;
+    for (qsizetype i = 0; i < in.size(); ++i) {
+        if (in[i] != '\\' || i + 1 == in.size())
+            bytes += in[i];
+        else if (in[++i] == 'x')
+            bytes += static_cast<char>(in.mid(i + 1, 2).toInt(nullptr, 16)), i += 2;
+        else if (in[i] == 'c')
+            ++i;
+        else
+            bytes += in[i] == 'r' ? '\r' : in[i] == 'n' ? '\n' : in[i] == 't' ? '\t' : in[i];
+    }
+    return bytes;
+}
+
+class Import : public ::testing::TestWithParam<Case> {};
+
+TEST_P(Import, Case) {
+    const QByteArray input = unescaped(GetParam().input);
+    QStringList lines;
+    try {
+        const QString& kind = GetParam().kind;
+        for (const auto& [person, groups] :
+             kind == "vcard" ? VCardImporter::parse(input)
+             : kind == "csv" ? CsvImporter::parse(input)
+                             : ContactsFile::read(PELMO_TEST_DATA "/import/" + input.trimmed()))
+            lines << contactLine(person, groups);
+    } catch (const ImportError& error) {
+        EXPECT_EQ(error.name(), "MalformedContactsFile");
+        lines << QStringLiteral("error %1: %2").arg(error.line()).arg(error.reason());
+    }
+    EXPECT_EQ(lines.join('\n').toStdString(), GetParam().expected.toStdString());
+}
+
+INSTANTIATE_TEST_SUITE_P(Contacts, Import, ::testing::ValuesIn(cases("import/cases.txt")));
+
+// Persons as their contact lines, with the groups they are in; then each group and its members.
+QString dump(const AddressBook& book) {
+    QStringList lines;
+    for (const Person& person : book.persons()) {
+        QStringList groups;
+        for (const Group& group : book.groupsOf(person.id))
+            groups << group.name;
+        lines << contactLine(person, groups);
+    }
+    for (const Group& group : book.groups()) {
+        QStringList members;
+        const std::optional<QList<Person>> inGroup = book.members(group.id);
+        for (const Person& member : *inGroup)
+            members << member.fullName();
+        lines << (group.name + ": " + members.join(", ")).trimmed();
+    }
+    return lines.join('\n');
+}
+
+QString modeOf(const QString& path) {
+    struct stat status {};
+    return ::stat(qPrintable(path), &status) ? "-" : QString::number(status.st_mode & 07777, 8);
+}
+
+// Does one line of a case to the book, answering what it answers.
+QString apply(AddressBook& book, const QStringList& words) {
+    const QString& op = words[0];
+    const qint64 id = words.value(1).toLongLong(), other = words.value(2).toLongLong();
+    Person person = contactOf(words.value(op == "add" ? 1 : 2)).person;
+    person.id = id;
+    if (op == "add")
+        return QString::number(book.addPerson(person));
+    if (op == "update")
+        book.updatePerson(person);
+    if (op == "remove")
+        book.removePerson(id);
+    if (op == "group")
+        return QString::number(book.addGroup(words[1]));
+    if (op == "rename")
+        book.renameGroup(id, words[2]);
+    if (op == "ungroup")
+        book.removeGroup(id);
+    if (op == "join")
+        book.addMember(id, other);
+    if (op == "leave")
+        book.removeMember(id, other);
+    if (op == "person")
+        return book.person(id) ? contactLine(*book.person(id), {}) : "none";
+    if (op == "named")
+        return book.groupNamed(words[1]) ? QString::number(book.groupNamed(words[1])->id) : "none";
+    if (op == "members")
+        return book.members(id) ? QString::number(book.members(id)->size()) : "none";
+    const QString path = QFileInfo(book.path()).dir().filePath(words.value(1));
+    if (op == "mkdir")
+        ::mkdir(path.toLocal8Bit().constData(), words[2].toUInt(nullptr, 8));
+    if (op == "touch" && QFile(path).open(QIODevice::WriteOnly))
+        ::chmod(path.toLocal8Bit().constData(), words[2].toUInt(nullptr, 8));
+    if (op == "mode")
+        return modeOf(path);
+    if (op == "open") { // another book, at a path or in the data folder, and the mode of its file
+        std::optional<AddressBook> opened;
+        words.size() > 1 ? opened.emplace(path) : opened.emplace();
+        return modeOf(opened->path());
+    }
+    if (op == "elsewhere") { // on a second connection to the same file
+        AddressBook elsewhere(book.path());
+        return apply(elsewhere, words.mid(1));
+    }
+    if (op == "import") {
+        QList<ImportedContact> contacts;
+        for (const QString& line : words.mid(1))
+            contacts << contactOf(line);
+        const ImportSummary summary = book.add(contacts);
+        return QStringLiteral("%1 added, %2 known, %3 groups")
+            .arg(summary.personsAdded)
+            .arg(summary.personsKnown)
+            .arg(summary.groups);
+    }
+    if (op == "sql") { // straight to the file, past the book
+        {
+            QSqlDatabase raw = QSqlDatabase::addDatabase("QSQLITE", "raw");
+            raw.setDatabaseName(book.path());
+            EXPECT_TRUE(raw.open() && QSqlQuery(raw).exec(words[1]));
+        }
+        QSqlDatabase::removeDatabase("raw");
+    }
+    return {};
+}
+
+class Book : public ::testing::TestWithParam<Case> {};
+
+TEST_P(Book, Change) {
+    QTemporaryDir folder;
+    const QByteArray saved = qgetenv("XDG_DATA_HOME");
+    qputenv("XDG_DATA_HOME", folder.path().toUtf8());
+    const mode_t mask = ::umask(0);
+    AddressBook book(folder.filePath("book.sqlite"));
+    apply(book, {"import", "Alan|Turing|alan@example.org;*turing@work.example|Club",
+                 "Ada|Lovelace|*ada@example.org|Club"});
+    QStringList lines;
+    for (const QString& line : GetParam().input.split('\n', Qt::SkipEmptyParts)) {
+        const QString before = dump(book);
+        try {
+            lines << apply(book, QProcess::splitCommand(QString::fromUtf8(unescaped(line))));
+        } catch (const PelmoException& failure) {
+            lines << QString::fromUtf8(failure.what()).replace(book.path(), "BOOK");
+            EXPECT_EQ(dump(book).toStdString(), before.toStdString()) << "kept whole or not at all";
+        }
+    }
+    lines.removeAll(QString());
+    EXPECT_EQ((lines.join('\n') + "\n--\n" + dump(book)).trimmed().toStdString(),
+              GetParam().expected.toStdString());
+    ::umask(mask);
+    qputenv("XDG_DATA_HOME", saved);
+}
+
+INSTANTIATE_TEST_SUITE_P(Rules, Book, ::testing::ValuesIn(cases("addressbook/changes.txt")));
 
 } // namespace

@@ -37,37 +37,19 @@ QList<QByteArray> ServerProcess::records() {
     return lines;
 }
 
-namespace {
-
-bool openssl(const QStringList& arguments, const QString& folder) {
-    QProcess process;
-    process.setWorkingDirectory(folder);
-    process.start(QStringLiteral("openssl"), arguments);
-    return process.waitForFinished(30000) && process.exitCode() == 0;
-}
-
-} // namespace
-
 Certificates::Certificates(const QString& folder)
     : ca(folder + QStringLiteral("/ca.pem")), cert(folder + QStringLiteral("/server.pem")),
       key(folder + QStringLiteral("/server.key")) {
-    QFile extensions(folder + QStringLiteral("/san.cnf"));
-    extensions.open(QIODevice::WriteOnly);
-    extensions.write("subjectAltName=DNS:localhost,IP:127.0.0.1\n");
-    extensions.close();
-    ok =
-        openssl(QString("req -x509 -newkey rsa:2048 -nodes -days 2 -subj /CN=Pelmo-Test-CA -keyout "
-                        "ca.key -out ca.pem")
-                    .split(QLatin1Char(' ')),
-                folder) &&
-        openssl(QString("req -newkey rsa:2048 -nodes -subj /CN=localhost -keyout server.key -out "
-                        "server.csr")
-                    .split(QLatin1Char(' ')),
-                folder) &&
-        openssl(QString("x509 -req -in server.csr -CA ca.pem -CAkey ca.key -CAcreateserial -days 2 "
-                        "-extfile san.cnf -out server.pem")
-                    .split(QLatin1Char(' ')),
-                folder);
+    const char* script =
+        "cd \"$0\" && echo subjectAltName=DNS:localhost,IP:127.0.0.1 >san.cnf && "
+        "openssl req -x509 -newkey rsa:2048 -nodes -days 2 -subj /CN=Pelmo-Test-CA -keyout ca.key "
+        "-out ca.pem && openssl req -newkey rsa:2048 -nodes -subj /CN=localhost -keyout server.key "
+        "-out server.csr && openssl x509 -req -in server.csr -CA ca.pem -CAkey ca.key "
+        "-CAcreateserial -days 2 -extfile san.cnf -out server.pem";
+    QProcess openssl;
+    openssl.start(QStringLiteral("sh"),
+                  {QStringLiteral("-c"), QString::fromLatin1(script), folder});
+    ok = openssl.waitForFinished(60000) && openssl.exitCode() == 0;
 }
 
 PelmoRun runPelmo(const QStringList& arguments, const QProcessEnvironment& environment) {

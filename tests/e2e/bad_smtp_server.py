@@ -1,44 +1,26 @@
 #!/usr/bin/env python3
-"""An SMTP server that misbehaves on purpose, on 127.0.0.1.
+"""An SMTP server on 127.0.0.1 that misbehaves on purpose: with --mode drop-in-data it drops the
+connection once the message text starts; with --mode silent it never says a word. Prints
+"PORT <n>" once listening; stops when its input closes or after --lifetime seconds."""
 
---mode drop-in-data: greets and answers normally, then closes the connection in the middle of
-                     the message text.
---mode silent:       accepts the connection and never says a word.
+import argparse, os, socket, sys, threading, time
 
-Prints "PORT <n>" once listening; stops when its standard input closes or after --lifetime
-seconds.
-"""
-
-import argparse
-import os
-import selectors
-import socket
-import sys
-import time
+REPLIES = {b"EHLO": b"250-localhost\r\n250 8BITMIME\r\n", b"DATA": b"354 go ahead\r\n"}
 
 
-def serve(connection, mode):
-    if mode == "silent":
-        return
-    replies = {b"EHLO": b"250-localhost\r\n250 8BITMIME\r\n", b"HELO": b"250 localhost\r\n",
-               b"MAIL": b"250 OK\r\n", b"RCPT": b"250 OK\r\n", b"DATA": b"354 go ahead\r\n"}
+def serve(connection):
     connection.sendall(b"220 localhost ESMTP\r\n")
-    pending = b""
-    in_data = False
+    pending, in_data = b"", False
     while True:
         chunk = connection.recv(65536)
-        if not chunk:
-            return
-        if in_data:
-            connection.close()  # the message has started to arrive: drop it half-way
+        if not chunk or in_data:  # once the message has started to arrive, drop it half-way
+            connection.close()
             return
         pending += chunk
         while b"\r\n" in pending:
             line, pending = pending.split(b"\r\n", 1)
-            verb = line[:4].upper()
-            connection.sendall(replies.get(verb, b"250 OK\r\n"))
-            if verb == b"DATA":
-                in_data = True
+            connection.sendall(REPLIES.get(line[:4].upper(), b"250 OK\r\n"))
+            in_data = in_data or line[:4].upper() == b"DATA"
 
 
 def main():
@@ -46,25 +28,20 @@ def main():
     parser.add_argument("--mode", choices=["drop-in-data", "silent"], required=True)
     parser.add_argument("--lifetime", type=float, default=60.0)
     args = parser.parse_args()
-    listener = socket.socket()
-    listener.bind(("127.0.0.1", 0))
-    listener.listen(8)
+    listener = socket.create_server(("127.0.0.1", 0))
+    listener.settimeout(0.5)
     print(f"PORT {listener.getsockname()[1]}", flush=True)
-    selector = selectors.DefaultSelector()
-    selector.register(listener, selectors.EVENT_READ)
-    selector.register(sys.stdin, selectors.EVENT_READ)
-    held = []
+    # It stops when its standard input closes.
+    threading.Thread(target=lambda: (sys.stdin.read(), os._exit(0)), daemon=True).start()
+    held = []  # a silent server keeps its connections open
     deadline = time.monotonic() + args.lifetime
     while time.monotonic() < deadline:
-        for key, _ in selector.select(timeout=0.5):
-            if key.fileobj is sys.stdin:
-                if not os.read(sys.stdin.fileno(), 4096):
-                    return
-            else:
-                connection, _ = listener.accept()
-                held.append(connection)  # a silent server keeps its connections open
-                serve(connection, args.mode)
-
+        try:
+            held.append(listener.accept()[0])
+        except socket.timeout:
+            continue
+        if args.mode == "drop-in-data":
+            serve(held[-1])
 
 if __name__ == "__main__":
     main()
