@@ -28,23 +28,19 @@ public:
     QString stored;
     bool answers = true;
     void readPassword(const QString&, QObject* context, ReadAnswer answer) override {
-        QTimer::singleShot(1, context, [this, answer] { answer(answers ? stored : QString()); });
+        later(context, [this, answer] { answer(answers ? stored : QString()); });
     }
     void writePassword(const QString&, const QString& password, QObject* context,
                        WriteAnswer answer) override {
-        QTimer::singleShot(1, context, [this, password, answer] {
-            if (answers)
-                stored = password;
-            answer(answers);
-        });
+        later(context, [=, this] { answer(answers && (stored = password, true)); });
     }
     void deletePassword(const QString&, QObject* context, WriteAnswer answer) override {
-        QTimer::singleShot(1, context, [this, answer] {
-            stored.clear();
-            answer(answers);
-        });
+        later(context, [this, answer] { stored.clear(), answer(answers); });
     }
     bool keyringAnswers() const override { return answers; }
+    static void later(QObject* context, std::function<void()> call) {
+        QTimer::singleShot(1, context, std::move(call));
+    }
 };
 
 // The settings file the controller reads, for tests to write.
@@ -53,22 +49,20 @@ struct TestSettings {
         static QSettings store(QStringLiteral("Orvale Software"), QStringLiteral("Pelmo"));
         return store;
     }
+    /** An invalid value stands for a key the file does not have. */
     static void set(const char* key, const QVariant& value) {
-        settings().setValue(QLatin1String(key), value);
+        value.isValid() ? settings().setValue(QLatin1String(key), value)
+                        : settings().remove(QLatin1String(key));
         settings().sync();
     }
-    static void clearSettings() {
-        settings().clear();
-        settings().sync();
-    }
+    static void clearSettings() { settings().clear(), settings().sync(); }
     /** Runs the event loop until done() holds or a generous deadline passes; answers done(). */
     static bool waitUntil(const std::function<bool()>& done, int ms = 5000) {
-        QEventLoop loop;
         QTimer deadline;
         deadline.setSingleShot(true);
         deadline.start(ms);
         while (!done() && deadline.isActive())
-            loop.processEvents(QEventLoop::WaitForMoreEvents, 20);
+            QEventLoop().processEvents(QEventLoop::WaitForMoreEvents, 20);
         return done();
     }
 };
@@ -82,16 +76,14 @@ public:
         book = std::make_unique<AddressBook>(folder.filePath(QStringLiteral("book.sqlite")));
         controller = std::make_unique<PelmoController>(view, *book, keyring, mailSettings);
     }
-
     /** Presses Send and waits until the run has nothing under way. */
     void runUntilSettled(int ms = 5000) {
         bool settled = false;
-        const auto connection = QObject::connect(controller.get(), &PelmoController::runSettled,
-                                                 [&settled] { settled = true; });
+        QObject context;
+        QObject::connect(controller.get(), &PelmoController::runSettled, &context,
+                         [&settled] { settled = true; });
         controller->send();
-        waitUntil([&settled] { return settled; }, ms);
-        QObject::disconnect(connection);
-        ASSERT_TRUE(settled) << "the run never settled";
+        ASSERT_TRUE(waitUntil([&settled] { return settled; }, ms)) << "the run never settled";
     }
 
     QTemporaryDir folder;

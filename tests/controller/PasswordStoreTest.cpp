@@ -11,33 +11,31 @@ TEST(PasswordStore, WritesReadsAndDeletesOrSaysThereIsNoKeyring) {
     QObject context;
     const QString key = QStringLiteral("loginPassword");
     QStringList answers;
+    const auto answered = [&](qsizetype count) {
+        return TestSettings::waitUntil([&] { return answers.size() == count; });
+    };
     const auto read = [&] {
         store.readPassword(key, &context, [&](const QString& password) {
             answers << (password.isNull() ? QStringLiteral("null") : password);
         });
     };
-    const auto write = [&](bool* done) {
-        store.writePassword(key, QStringLiteral("s3cret"), &context, [&answers, done](bool ok) {
-            *done = ok;
-            answers << QStringLiteral("written");
-        });
+    const auto done = [&answers](const QString& what) {
+        return [&answers, what](bool ok) { answers << what + (ok ? " ok" : " failed"); };
     };
     read(); // an entry nobody stored is not found
-    bool written = false;
-    write(&written);
-    ASSERT_TRUE(TestSettings::waitUntil([&] { return answers.size() == 2; }));
-    EXPECT_EQ(answers.first(), QStringLiteral("null"));
-    EXPECT_EQ(store.keyringAnswers(), written);
+    store.writePassword(key, QStringLiteral("s3cret"), &context, done("written"));
+    ASSERT_TRUE(answered(2));
+    const bool keyring = answers.last() == QLatin1String("written ok");
+    EXPECT_EQ(store.keyringAnswers(), keyring);
     read();
-    ASSERT_TRUE(TestSettings::waitUntil([&] { return answers.size() == 3; }));
-    EXPECT_EQ(answers.last(), written ? QStringLiteral("s3cret") : QStringLiteral("null"));
-    bool deleted = false;
-    store.deletePassword(key, &context, [&](bool ok) {
-        deleted = ok;
-        answers << QStringLiteral("deleted");
-    });
-    ASSERT_TRUE(TestSettings::waitUntil([&] { return answers.size() == 4; }));
-    EXPECT_EQ(deleted, written);
+    ASSERT_TRUE(answered(3));
+    store.deletePassword(key, &context, done("deleted"));
+    ASSERT_TRUE(answered(4));
+    read();
+    ASSERT_TRUE(answered(5));
+    const QString outcome = keyring ? QStringLiteral("ok") : QStringLiteral("failed");
+    EXPECT_EQ(answers.join(' '), QStringLiteral("null written %1 %2 deleted %1 null")
+                                     .arg(outcome, keyring ? "s3cret" : "null"));
 }
 
 } // namespace

@@ -4,29 +4,27 @@
 
 #include <QStringList>
 
-// A view that keeps what the controller shows, counts how often each field is read, and writes
-// every change the controller makes to it into one transcript, in order.
+// A view that keeps what the controller shows and writes every change the controller makes to
+// it into one transcript, in order.
 class RecordingView : public PelmoView {
 public:
     QString subjectText, toText, nameText, pageText, buttonTitle = QStringLiteral("Send");
-    QStringList statuses;
-    QStringList events; // beeps and alerts in order
-    QStringList transcript;
-    mutable int subjectReads = 0, toReads = 0, nameReads = 0;
+    QStringList statuses, events /* beeps and alerts */, transcript;
     double maximum = 0;
 
-    QString subject() const override { return ++subjectReads, subjectText; }
+    QString subject() const override { return subjectText; }
     void setSubject(const QString& text) override { note("subject", subjectText = text); }
-    QString to() const override { return ++toReads, toText; }
+    QString to() const override { return toText; }
     void setTo(const QString& text) override { note("to", toText = text); }
-    QString name() const override { return ++nameReads, nameText; }
+    QString name() const override { return nameText; }
     void setName(const QString& text) override { note("name", nameText = text); }
     QString webPageOrFile() const override { return pageText; }
     void setWebPageOrFile(const QString& text) override { note("page", pageText = text); }
-    void setStatus(const QString& text) override { note("status", dateless(text)), statuses << text; }
+    void setStatus(const QString& text) override {
+        note("status", dateless(text)), statuses << text;
+    }
     void setProgressCounting(double min, double max, double val) override {
-        maximum = max;
-        note("bar", QStringLiteral("%1..%2 at %3").arg(min).arg(max).arg(val));
+        note("bar", QStringLiteral("%1..%2 at %3").arg(min).arg(maximum = max).arg(val));
     }
     void setProgressBusy() override { note("bar", QStringLiteral("busy")); }
     void setProgressValue(double val) override { note("bar", QStringLiteral("at %1").arg(val)); }
@@ -40,13 +38,10 @@ public:
         events << QStringLiteral("alert: %1 / %2").arg(title, text);
         note("alert", events.last());
     }
-    void beep() override {
-        events << QStringLiteral("beep");
-        transcript << events.last();
-    }
+    void beep() override { events << QStringLiteral("beep"), transcript << events.last(); }
 
     void note(const char* what, const QString& text) {
-        transcript << QLatin1String(what) + QLatin1String(": ") + text;
+        transcript << what + QStringLiteral(": ") + text;
     }
 
     // "[Mailing started at <date>]" and "[<date>] Mail to: ..." with their dates left out.

@@ -14,12 +14,9 @@
 class ScriptedSession : public SmtpSession {
 public:
     struct Script {
-        bool implicitTls = false; // the transport is TLS from the start (port 465)
-        bool acceptLogin = true;
-        bool timeOutOnConnect = false;
-        bool loseConnectionOnSend = false;
-        bool dropWhenIdle = false; // the server drops a connection nobody talks on
-        QByteArray refusal;        // non-empty: the message is refused with this reply
+        bool implicitTls = false, acceptLogin = true, timeOutOnConnect = false;
+        bool loseConnectionOnSend = false, dropWhenIdle = false;
+        QByteArray refusal;           // non-empty: the message is refused with this reply
         std::function<void()> onSend; // runs when the message goes
     };
 
@@ -31,7 +28,7 @@ public:
         if (m_script.timeOutOnConnect)
             return later(&SmtpSession::connectionTimedOut);
         later(&SmtpSession::connectionEstablished);
-        if (!m_script.implicitTls)
+        if (!m_tls)
             later(&SmtpSession::serviceInitialized);
         if (m_script.dropWhenIdle)
             QTimer::singleShot(100, this, [this] {
@@ -41,13 +38,10 @@ public:
     }
     bool isSSL() const override { return m_tls; }
     void startSSL() override {
-        note(QStringLiteral("startSSL"));
-        later(&SmtpSession::serviceInitialized);
+        note(QStringLiteral("startSSL")), later(&SmtpSession::serviceInitialized);
     }
     void startTLS() override {
-        note(QStringLiteral("startTLS"));
-        m_tls = true;
-        later(&SmtpSession::serviceInitialized);
+        note(QStringLiteral("startTLS")), m_tls = true, later(&SmtpSession::serviceInitialized);
     }
     QStringList supportedMechanisms() const override { return {"PLAIN", "LOGIN"}; }
     void authenticate(const QString& user, const QString& password,
@@ -56,10 +50,10 @@ public:
         later(m_script.acceptLogin ? &SmtpSession::authenticationCompleted
                                    : &SmtpSession::authenticationFailed);
     }
-    void setMessage(const QByteArray& message, const QString& sender,
+    void setMessage(const QByteArray&, const QString& sender,
                     const QStringList& recipients) override {
-        note(QStringLiteral("message from %1 to %2").arg(sender, recipients.join(QLatin1Char(','))));
-        m_message = message;
+        note(
+            QStringLiteral("message from %1 to %2").arg(sender, recipients.join(QLatin1Char(','))));
     }
     void sendMessage() override {
         note(QStringLiteral("send"));
@@ -72,9 +66,7 @@ public:
                                          : &SmtpSession::messageNotSent);
     }
     void close() override {
-        note(QStringLiteral("close"));
-        m_closed = true;
-        later(&SmtpSession::connectionTerminated);
+        note(QStringLiteral("close")), m_closed = true, later(&SmtpSession::connectionTerminated);
     }
     QByteArray lastResponse() const override { return m_last; }
     QString errorString() const override {
@@ -87,13 +79,16 @@ private:
     void note(const QString& call) { m_transcript << QStringLiteral("smtp: ") + call; }
     void later(void (SmtpSession::*signal)()) {
         QMetaObject::invokeMethod(
-            this, [this, signal] { Q_EMIT(this->*signal)(); }, Qt::QueuedConnection);
+            this,
+            [this, signal] {
+                Q_EMIT(this->*signal)
+                ();
+            },
+            Qt::QueuedConnection);
     }
 
     Script m_script;
     QStringList& m_transcript;
-    QByteArray m_message;
     QByteArray m_last;
-    bool m_tls;
-    bool m_closed = false;
+    bool m_tls, m_closed = false;
 };
