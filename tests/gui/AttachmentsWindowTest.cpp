@@ -1,7 +1,6 @@
 #include "gui/AttachmentsWindow.h"
 #include "DesktopStandIn.h"
 #include "GuiFixture.h"
-#include "RowName.h"
 #include "attachments/AttachmentsController.h"
 #include "gui/AttachmentsModel.h"
 
@@ -33,59 +32,46 @@ protected:
     QTableView* table = nullptr;
 };
 
-// Rows in the private type, file URLs ("/" is a folder, the others do not exist), or both, or
-// junk in the private type; dropped at the top edge of row at, or below the last row.
-struct Drop {
-    std::string name;
-    QList<int> rows;
-    QStringList urls;
-    int at;
-    QString expected;
-    bool taken, junk = false;
-    friend void PrintTo(const Drop& row, std::ostream* out) { *out << row.name; }
-};
+// The rows of tests/data/gui/drops.txt, dropped by the view's own events.
+std::vector<std::string> drops() {
+    QFile file(QStringLiteral(PELMO_TEST_DATA "/gui/drops.txt"));
+    EXPECT_TRUE(file.open(QIODevice::ReadOnly));
+    std::vector<std::string> rows;
+    for (const QByteArray& line : file.readAll().split('\n'))
+        if (!line.startsWith('#') && line.count(" | ") == 5)
+            rows.push_back(line.toStdString());
+    return rows;
+}
 
-class Drops : public AttachmentsTable, public ::testing::WithParamInterface<Drop> {};
+class Drops : public AttachmentsTable, public ::testing::WithParamInterface<std::string> {};
 
 TEST_P(Drops, Land) {
-    const Drop& row = GetParam();
-    auto data = row.rows.isEmpty() ? std::make_unique<QMimeData>()
-                                   : AttachmentsController::rowDragData(row.rows);
-    if (row.junk)
+    const QStringList field = QString::fromStdString(GetParam()).split(" | ");
+    QList<int> rows;
+    for (const QString& row : field[1].split(' ', Qt::SkipEmptyParts))
+        if (row != "junk")
+            rows += row.toInt();
+    auto data =
+        rows.isEmpty() ? std::make_unique<QMimeData>() : AttachmentsController::rowDragData(rows);
+    if (field[1] == "junk")
         data->setData(AttachmentsController::privateDragType, "not an index set");
-    data->setUrls(QUrl::fromStringList(row.urls));
+    data->setUrls(QUrl::fromStringList(field[2].split(' ', Qt::SkipEmptyParts)));
     const Qt::DropAction action = data->hasUrls() ? Qt::CopyAction : Qt::MoveAction;
-    const QPoint at = rect(row.at).isValid() ? rect(row.at).topLeft() + QPoint(5, 1)
-                                             : QPoint(5, table->viewport()->height() - 2);
+    const QRect target = rect(field[3].toInt());
+    const QPoint at = target.isValid() ? target.topLeft() + QPoint(5, 1)
+                                       : QPoint(5, table->viewport()->height() - 2);
     QDragEnterEvent enter(at, action, data.get(), Qt::LeftButton, {});
     QDropEvent dropped(at, action, data.get(), Qt::LeftButton, {});
     QSignalSpy changes(&window->attachments(), &AttachmentsController::attachmentsChanged);
     QCoreApplication::sendEvent(table->viewport(), &enter);
     QCoreApplication::sendEvent(table->viewport(), &dropped);
-    EXPECT_EQ(enter.isAccepted() && dropped.isAccepted(), row.taken);
+    EXPECT_EQ(enter.isAccepted() && dropped.isAccepted(), field[5] == "taken");
     EXPECT_EQ(shown() + " / " + QString::number(changes.size()),
-              row.expected + (row.expected == "/a /b /c /d" ? " / 0" : " / 1"));
+              field[4] + (field[4] == "/a /b /c /d" ? " / 0" : " / 1"));
 }
 
-INSTANTIATE_TEST_SUITE_P(
-    Rows, Drops,
-    ::testing::Values(
-        // Each file goes in at the same index, so several land in reverse order.
-        Drop{"files", {}, {"file:///x", "file:///y"}, 1, "/a /y /x /b /c /d", true},
-        Drop{"below_last", {}, {"file:///x"}, -1, "/a /b /c /d /x", true},
-        Drop{"duplicate", {}, {"file:///a"}, 0, "/a /a /b /c /d", true},
-        Drop{"web_left_out", {}, {"https://e.org/p", "file:///x"}, 3, "/a /b /c /x /d", true},
-        Drop{"web_only", {}, {"https://e.org/p"}, 0, "/a /b /c /d", false},
-        // Only the first file is judged: a folder after it comes along.
-        Drop{"folder_first", {}, {"file:///", "file:///x"}, 0, "/a /b /c /d", false},
-        Drop{"folder_second", {}, {"file:///x", "file:///"}, 0, "/ /x /a /b /c /d", true},
-        // A row lands above the drop point; of several rows only the first moves.
-        Drop{"down", {0}, {}, 3, "/b /c /a /d", true}, Drop{"up", {2}, {}, 0, "/c /a /b /d", true},
-        Drop{"first_of_two", {3, 1}, {}, 0, "/b /a /c /d", true},
-        Drop{"own_place", {1}, {}, 1, "/a /b /c /d", true},
-        Drop{"rows_before_urls", {2}, {"file:///x"}, 0, "/c /a /b /d", true},
-        Drop{"junk", {}, {}, 0, "/a /b /c /d", false, true}),
-    RowName());
+INSTANTIATE_TEST_SUITE_P(Rows, Drops, ::testing::ValuesIn(drops()),
+                         [](const auto& row) { return row.param.substr(0, row.param.find(' ')); });
 
 TEST_F(AttachmentsTable, RowsAreDraggedOpenedAndRemoved) {
     // The table's own drags, which never land onto a row.

@@ -50,7 +50,7 @@ protected:
     bool idle = false;
 };
 
-TEST_F(WindowRun, SendMailsTheTypedRecipient) {
+TEST_F(WindowRun, SendMailsTheTypedRecipientThenAGroup) {
     press();
     // A setting that fails stops the run before it starts and frees the button.
     EXPECT_TRUE(status().startsWith("Error (NoServer): ")) << status().toStdString();
@@ -70,10 +70,8 @@ TEST_F(WindowRun, SendMailsTheTypedRecipient) {
     QTest::mouseClick(child<QPushButton>("resetButton", &window->recipientsWindow()),
                       Qt::LeftButton);
     EXPECT_EQ(shown(), "Send -1 of 1 /");
-}
 
-TEST_F(WindowRun, AGroupCountsOnTheBarAndStopLetsTheCurrentCopyFinish) {
-    set("serverAddress", "127.0.0.1");
+    // A group counts on the bar, and Stop lets the copy on its way finish.
     for (const char* first : {"Ann", "Bob", "Cy"})
         addPerson(first, "Test", "Club");
     picker().reload();
@@ -111,19 +109,19 @@ TEST_F(GuiFixture, BoldFormatsTheSelectionOrWhatIsTypedNext) {
     EXPECT_EQ(pelmo->message()->toMarkdown(), "**on Saturday at**\n\n");
 }
 
-class Preferences : public GuiFixture {
-protected:
-    PreferencesDialog* open() {
+// Each field is named after its setting and shown as the settings file writes it: a line's
+// text, a port, a box's check, a choice's item (stored as its index).
+TEST_F(GuiFixture, PreferencesShowWhatIsStoredAndOkStoresWhatIsEntered) {
+    const auto open = [this] {
         child<QAction>("preferencesAction")->trigger();
         return asked<PreferencesDialog>();
-    }
-    static QString stored(const char* key) {
-        settings().sync();
-        return settings().value(key).toString();
-    }
+    };
+    const auto stored = [](const char* key) {
+        return settings().sync(), settings().value(key).toString();
+    };
     // Enters password and presses OK, the keyring answering in the background. Expected: what
     // the field and the note show, the note after, and the keyring's and the file's copy.
-    void enter(const QString& password, const QStringList& expected) {
+    const auto enter = [&](const QString& password, const QStringList& expected) {
         auto* field = child<QLineEdit>("loginPassword", open());
         auto* note = child<QLabel>("passwordNote", field->window());
         EXPECT_EQ(field->echoMode(), QLineEdit::Password);
@@ -137,12 +135,7 @@ protected:
         asked<QDialog>()->accept();
         EXPECT_TRUE(waitUntil([&] { return told().mid(1) == expected.mid(2); }))
             << told().join(" | ").toStdString();
-    }
-};
-
-// Each field is named after its setting and shown as the settings file writes it: a line's
-// text, a port, a box's check, a choice's item (stored as its index).
-TEST_F(Preferences, ShowWhatIsStoredAndOkStoresWhatIsEntered) {
+    };
     const struct {
         const char* key;
         QString before, shown, entered, after;
@@ -174,11 +167,9 @@ TEST_F(Preferences, ShowWhatIsStoredAndOkStoresWhatIsEntered) {
     child<QLineEdit>("senderName", open())->setText("Somebody else");
     dialog->reject(); // stores nothing
     EXPECT_EQ(stored("senderName"), "You");
-}
 
-// The password goes to the keyring when one answers, leaving no copy in the settings file,
-// and to the settings file otherwise; the note tells which.
-TEST_F(Preferences, ThePasswordsPlaceIsToldAndKept) {
+    // The password goes to the keyring when one answers, leaving no copy in the settings file,
+    // and to the settings file otherwise; the note tells which.
     const QString file = "the settings file " + settings().fileName() + ".";
     const QString inKeyring = "The password is kept in the system keyring.";
     set("loginPassword", "plain");

@@ -40,10 +40,8 @@ inline Outcome drive(quint16 port, const Plan& plan) {
     bool authenticated = plan.mechanism.isEmpty(), read = false;
     qsizetype sent = 0;
     const auto readOutcome = [&] {
-        read = true;
-        out.error = client->errorString();
+        read = true, out.error = client->errorString(), out.ssl = client->isSSL();
         out.lastResponse = client->lastResponse();
-        out.ssl = client->isSSL();
     };
     const auto close = [&] { readOutcome(), client->close(), client->close(); };
     const auto next = [&] {

@@ -1,9 +1,7 @@
 #!/usr/bin/env python3
-"""An SMTP server that plays one conversation of a transcript file on 127.0.0.1, for servers
-that misbehave on purpose. It writes its "S: " lines up to the next "C: " line, takes any one
-line from the client in its place, and so on; "hang up" closes the connection, "pieces n"
-writes n bytes at a time 20 ms apart, "not listening" refuses the connection. Prints
-"PORT <n>", then each line from the client as a JSON string, and "END" once it is over."""
+"""An SMTP server on 127.0.0.1 that misbehaves on purpose: it plays one conversation of a
+transcript file, read as the head of tests/data/smtp/conversations.txt tells. Prints "PORT <n>",
+then each line from the client as a JSON string, and "END" once it is over."""
 
 import json
 import socket
@@ -18,10 +16,9 @@ listener = socket.create_server(("127.0.0.1", 0))
 port = listener.getsockname()[1]
 if "not listening" in script:
     listener.close()
-print(f"PORT {port}", flush=True)
-if "not listening" in script:
-    print("END", flush=True)
+    print(f"PORT {port}\nEND", flush=True)
     sys.exit()
+print(f"PORT {port}", flush=True)
 listener.settimeout(30)
 connection = listener.accept()[0]
 connection.settimeout(30)

@@ -53,7 +53,7 @@ class Handler:
         return AuthResult(success=ok, handled=False)
 
 
-def main():
+if __name__ == "__main__":
     parser = argparse.ArgumentParser(description=__doc__)
     parser.add_argument("--tls", choices=["none", "starttls", "implicit"], default="none")
     parser.add_argument("--require-starttls", action="store_true")
@@ -92,6 +92,3 @@ def main():
     loop.run_forever()
     server.close()
 
-
-if __name__ == "__main__":
-    main()
