@@ -10,6 +10,7 @@
 #include <QRegularExpression>
 #include <QSet>
 #include <QSslSocket>
+#include <QUrl>
 
 #include <algorithm>
 #include <functional>
@@ -64,6 +65,28 @@ bool isEnvelopeSafe(const QString& address) {
         return c.unicode() < 0x20 || c.unicode() == 0x7f || c == QLatin1Char('<') ||
                c == QLatin1Char('>');
     });
+}
+
+// RFC 5321 4.1.2 wants the domain of a path in ASCII: an international domain goes in its
+// IDNA form (RFC 5890), which every server takes. Only a name before the @ that is not ASCII
+// still needs UTF-8, and with it a server offering SMTPUTF8 (RFC 6531 3.3).
+QByteArray envelopePath(const QString& address) {
+    const qsizetype at = address.lastIndexOf(QLatin1Char('@'));
+    if (at < 0)
+        return address.toUtf8();
+    const QString domain = address.mid(at + 1);
+    const QByteArray ace = QUrl::toAce(domain);
+    return address.left(at + 1).toUtf8() + (ace.isEmpty() ? domain.toUtf8() : ace);
+}
+
+// The first address of the envelope whose path is not ASCII, or a null string.
+QString firstUtf8Path(const QString& sender, const QStringList& recipients) {
+    for (const QString& address : QStringList{sender} + recipients) {
+        const QByteArray path = envelopePath(address);
+        if (!std::all_of(path.begin(), path.end(), [](char c) { return c > 0; }))
+            return address;
+    }
+    return {};
 }
 
 QString printable(QString text) {
@@ -234,9 +257,11 @@ void SmtpClient::sendMessage() {
             tr("The message (%1 bytes) is larger than the %2 bytes the server accepts.")
                 .arg(m_message.size())
                 .arg(m_capabilities.sizeLimit));
-    QByteArray command = "MAIL FROM:<" + m_sender.toUtf8() + '>';
+    QByteArray command = "MAIL FROM:<" + envelopePath(m_sender) + '>';
     if (m_capabilities.size) // RFC 1870 6: declare the size so the server can refuse it early
         command += " SIZE=" + QByteArray::number(m_message.size());
+    if (!firstUtf8Path(m_sender, m_recipients).isNull()) // RFC 6531 3.4
+        command += " SMTPUTF8";
     send(command);
     enter(State::MailFrom);
 }
@@ -584,6 +609,11 @@ QString SmtpClient::envelopeProblem() const {
             return tr("The recipient address \"%1\" contains a control character or an angle "
                       "bracket.")
                 .arg(printable(recipient));
+    if (const QString address = firstUtf8Path(m_sender, m_recipients);
+        !address.isNull() && !m_capabilities.smtpUtf8)
+        return tr("The address \"%1\" has a name before the @ that is not ASCII, which the "
+                  "server %2 does not accept (it does not offer SMTPUTF8).")
+            .arg(address, m_host);
     return {};
 }
 
@@ -607,7 +637,7 @@ void SmtpClient::onMailFrom(int code) {
 }
 
 void SmtpClient::sendNextRecipient() {
-    send("RCPT TO:<" + m_recipients[m_nextRecipient++].toUtf8() + '>');
+    send("RCPT TO:<" + envelopePath(m_recipients[m_nextRecipient++]) + '>');
     enter(State::RcptTo);
 }
 

@@ -59,6 +59,7 @@ struct SmtpCapabilities {
     QStringList mechanisms; ///< AUTH (RFC 4954 3), upper-case, each once
     bool size = false;      ///< SIZE (RFC 1870)
     qint64 sizeLimit = 0;   ///< SIZE's limit in bytes; 0 for none
+    bool smtpUtf8 = false;  ///< SMTPUTF8 (RFC 6531 3.2): addresses may be UTF-8
 
     static SmtpCapabilities fromEhlo(const SmtpReply& reply);
 };
