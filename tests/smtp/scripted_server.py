@@ -40,7 +40,7 @@ while True:
         line = b""
     if not line:
         break
-    print(json.dumps(line.decode("latin-1").removesuffix("\r\n")), flush=True)
+    print(json.dumps(line.decode("utf-8", "backslashreplace").removesuffix("\r\n")), flush=True)
     at += 1
 connection.close()
 print("END", flush=True)
