@@ -16,36 +16,33 @@
 namespace {
 
 // Whole-text conversion through iconv; null when the charset is unknown or a byte is invalid.
-// One byte may stand for several characters (TSCII gives up to twelve UTF-8 bytes), so the
-// output grows as needed; and a decoder may hold the last character back to combine it with
-// the next (windows-1258), so a call without input ends the conversion.
+// One byte may stand for several characters (TSCII gives up to twelve UTF-8 bytes), and a
+// decoder that runs out of room in the middle of such a sequence does not always resume it
+// correctly (glibc's TSCII repeats or drops characters), so a conversion that runs out of room
+// starts again from the first byte with twice the room. A decoder may also hold the last
+// character back to combine it with the next (windows-1258): a call without input ends it.
 QString convert(const QByteArray& bytes, const QByteArray& charset) {
     iconv_t cd = iconv_open("UTF-8", charset.constData());
     if (cd == reinterpret_cast<iconv_t>(-1))
         return {};
     std::unique_ptr<void, int (*)(iconv_t)> closer(cd, iconv_close);
-    QByteArray out(bytes.size() * 4 + 4, Qt::Uninitialized);
-    qsizetype written = 0;
-    char* in = const_cast<char*>(bytes.constData());
-    size_t inLeft = static_cast<size_t>(bytes.size());
-    for (bool ending = false;;) {
-        char* outPtr = out.data() + written;
-        size_t outLeft = static_cast<size_t>(out.size() - written);
-        const size_t result = ending ? iconv(cd, nullptr, nullptr, &outPtr, &outLeft)
-                                     : iconv(cd, &in, &inLeft, &outPtr, &outLeft);
-        written = outPtr - out.data();
-        if (result == static_cast<size_t>(-1)) {
-            if (errno != E2BIG)
-                return {};
-            out.resize(out.size() * 2);
-        } else if (ending) {
-            break;
-        } else {
-            ending = true;
-        }
+    for (qsizetype room = bytes.size() * 4 + 16;; room *= 2) {
+        iconv(cd, nullptr, nullptr, nullptr, nullptr); // back to the initial state
+        QByteArray out(room, Qt::Uninitialized);
+        char* in = const_cast<char*>(bytes.constData());
+        size_t inLeft = static_cast<size_t>(bytes.size());
+        char* outPtr = out.data();
+        size_t outLeft = static_cast<size_t>(room);
+        size_t result = iconv(cd, &in, &inLeft, &outPtr, &outLeft);
+        if (result != static_cast<size_t>(-1))
+            result = iconv(cd, nullptr, nullptr, &outPtr, &outLeft);
+        if (result == static_cast<size_t>(-1) && errno == E2BIG)
+            continue;
+        if (result == static_cast<size_t>(-1))
+            return {};
+        out.truncate(outPtr - out.data());
+        return QString::fromUtf8(out);
     }
-    out.truncate(written);
-    return QString::fromUtf8(out);
 }
 
 // The charset named by the Content-Type header, else by the page's own meta element.

@@ -188,11 +188,13 @@ const Scenario kScenarios[] = {
       send, page("ftp://host/x"), send}},
     // Stop while the page downloads ends the run at once: nothing is mailed, not even later.
     {"page_stopped", {page("http://127.0.0.1:PORT/dir/page.html"), press, press, pause}},
-    // Pages are decoded as UTF-8, else in the charset declared, else as Mac OS Roman; a redirect
+    // Pages are decoded as UTF-8, else in the charset declared (TSCII: several characters a
+    // byte), else as Mac OS Roman; a redirect
     // is followed; a server that has gone, or an address without a host, is said so.
     {"page_decoding",
      {page("http://127.0.0.1:PORT/dir/latin.html"), send, showPage,
       page("http://127.0.0.1:PORT/dir/roman.html"), send, showPage,
+      page("http://127.0.0.1:PORT/dir/tamil.html"), send, showPage,
       page("http://127.0.0.1:PORT/dir"), send, showPage, stopPageServer, send, page("http://"),
       send}},
     // The address recorded is the one the copy went to, whatever To says by then.

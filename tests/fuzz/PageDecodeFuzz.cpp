@@ -11,35 +11,24 @@
 
 #include <iconv.h>
 
-#include <cerrno>
 #include <optional>
 
 namespace {
 
-// The plain conversion: the output grows as needed, and the decoder's pending state is flushed.
+// The plain conversion: one call into room that no charset fills (iconv's decoders do not all
+// resume a sequence cut by a full buffer), then the decoder's pending state flushed.
 std::optional<QByteArray> iconvUtf8(const QByteArray& bytes, const QByteArray& charset) {
     const iconv_t cd = iconv_open("UTF-8", charset.constData());
     if (cd == reinterpret_cast<iconv_t>(-1))
         return std::nullopt;
-    QByteArray out;
-    char buffer[256];
+    QByteArray out(bytes.size() * 64 + 64, '\0');
     char* in = const_cast<char*>(bytes.constData());
-    size_t inLeft = static_cast<size_t>(bytes.size());
-    bool ok = true;
-    for (bool flushing = false;;) {
-        char* to = buffer;
-        size_t toLeft = sizeof buffer;
-        const size_t result = flushing ? iconv(cd, nullptr, nullptr, &to, &toLeft)
-                                       : iconv(cd, &in, &inLeft, &to, &toLeft);
-        out.append(buffer, to - buffer);
-        if (result != static_cast<size_t>(-1) || errno != E2BIG) {
-            ok = ok && result != static_cast<size_t>(-1);
-            if (flushing || !ok)
-                break;
-            flushing = true;
-        }
-    }
+    char* to = out.data();
+    size_t inLeft = static_cast<size_t>(bytes.size()), toLeft = static_cast<size_t>(out.size());
+    const bool ok = iconv(cd, &in, &inLeft, &to, &toLeft) != static_cast<size_t>(-1) &&
+                    iconv(cd, nullptr, nullptr, &to, &toLeft) != static_cast<size_t>(-1);
     iconv_close(cd);
+    out.truncate(to - out.data());
     return ok ? std::optional(out) : std::nullopt;
 }
 
