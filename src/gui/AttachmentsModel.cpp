@@ -76,9 +76,10 @@ bool AttachmentsModel::canDropMimeData(const QMimeData* data, Qt::DropAction, in
                                        const QModelIndex& parent) const {
     if (!data)
         return false;
-    // The table takes its own rows and local files, the two kinds of drag it registers for.
+    // The table takes its own rows and local files, the two kinds of drag it registers for; a
+    // drag of its own type whose rows cannot be read is refused while it moves, not at the drop.
     const AttachmentsController::Drag drag = AttachmentsController::readDrag(*data);
-    if (!drag.isRowDrag && drag.files.isEmpty())
+    if (drag.isRowDrag ? drag.rows.isEmpty() : drag.files.isEmpty())
         return false;
     return AttachmentsController::validateDrop(drag.firstFile(), parent.isValid()) !=
            AttachmentsController::dragOperationNone;

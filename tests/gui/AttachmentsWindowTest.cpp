@@ -66,6 +66,8 @@ TEST_P(Drops, Land) {
     QCoreApplication::sendEvent(table->viewport(), &enter);
     QCoreApplication::sendEvent(table->viewport(), &dropped);
     EXPECT_EQ(enter.isAccepted() && dropped.isAccepted(), field[5] == "taken");
+    // What the drag's cursor shows while it moves over the table.
+    EXPECT_EQ(model().canDropMimeData(data.get(), action, -1, -1, {}), field[5] == "taken");
     EXPECT_EQ(shown() + " / " + QString::number(changes.size()),
               field[4] + (field[4] == "/a /b /c /d" ? " / 0" : " / 1"));
 }
