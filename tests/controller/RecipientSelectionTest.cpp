@@ -86,24 +86,4 @@ TEST_F(Selection, PersonMeansOneMessage) {
     EXPECT_EQ(pending() + " " + view.toText, QStringLiteral("none Friends"));
 }
 
-// The filter is built for long lists; its answer must be the plain walk's answer.
-TEST_F(ControllerFixture, LargeFilterAgreesWithAPlainWalk) {
-    QList<Person> persons;
-    QStringList expectedSkips;
-    QList<qint64> expectedKept, kept;
-    for (int i = 0; i < 3000; ++i) {
-        const QString address = QStringLiteral("p%1@example.org").arg(i);
-        persons.append(Person{i + 1, "P", QString::number(i), {address}, 0});
-        if (i % 7 == 0)
-            controller->sentRecipients().addRecipient(address.toUpper());
-        i % 7 == 0 ? void(expectedSkips << "Skipping " + address) : expectedKept.append(i + 1);
-    }
-    controller->selection().setPeople(persons);
-    controller->selection().filterPeopleByRecipients();
-    for (const Person& person : *controller->getPeople())
-        kept << person.id;
-    EXPECT_EQ(kept, expectedKept);
-    EXPECT_EQ(view.statuses.mid(1), expectedSkips);
-}
-
 } // namespace

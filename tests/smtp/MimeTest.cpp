@@ -3,7 +3,6 @@
 
 #include "SmtpData.h"
 #include "e2e/E2eSupport.h"
-#include "smtp/HtmlCharset.h"
 #include "smtp/MessageAssembly.h"
 #include "smtp/QuotedPrintable.h"
 #include "util/PelmoException.h"
@@ -11,7 +10,6 @@
 #include <QDateTime>
 #include <QDir>
 #include <QRandomGenerator>
-#include <QTextDocument>
 #include <gtest/gtest.h>
 
 namespace {
@@ -181,25 +179,6 @@ TEST(QuotedPrintable, EncodesExactlyAndDecodesBack) {
         for (const QByteArray& line : encoded.split('\n'))
             EXPECT_LE(line.size(), 76);
         EXPECT_TRUE(encoded.count("=\n") == encoded.count('\n') && !encoded.contains('\r'));
-    }
-}
-
-// The body's HTML declares its set once, and what the set cannot hold becomes a numeric character
-// reference. (How text is escaped or replaced shows in the messages above.)
-TEST(HtmlCharset, ExportDeclaresTheSetAndEscapesTheRest) {
-    QTextDocument document;
-    document.setPlainText(QString::fromUtf8("Café ¥"));
-    // The set of each index of the setting, and the text as it holds it.
-    const QByteArrayList rows[] = {{"utf-8", "Caf\xc3\xa9 \xc2\xa5"},
-                                   {"us-ascii", "Caf&#233; &#165;"},
-                                   {"iso-8859-1", "Caf\xe9 \xa5"},
-                                   {"Shift_JIS", "Caf&#233; &#165;"},
-                                   {"utf-8", "Caf\xc3\xa9 \xc2\xa5"}};
-    for (int index = 0; index < 5; ++index) {
-        const QByteArray html = HtmlCharset::forIndex(index).exportDocument(document);
-        EXPECT_EQ(html.count("<meta charset="), 1) << index;
-        EXPECT_TRUE(html.contains("<meta charset=\"" + rows[index][0] + "\" />")) << index;
-        EXPECT_TRUE(html.contains(rows[index][1])) << html.toStdString();
     }
 }
 
