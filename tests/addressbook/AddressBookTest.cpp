@@ -1,4 +1,5 @@
 #include "addressbook/AddressBook.h"
+#include "RowName.h"
 #include "addressbook/ContactsFile.h"
 #include "addressbook/CsvImporter.h"
 #include "addressbook/ImportError.h"
@@ -105,7 +106,8 @@ TEST_P(Import, Case) {
     EXPECT_EQ(lines.join('\n').toStdString(), GetParam().expected.toStdString());
 }
 
-INSTANTIATE_TEST_SUITE_P(Contacts, Import, ::testing::ValuesIn(cases("import/cases.txt")));
+INSTANTIATE_TEST_SUITE_P(Contacts, Import, ::testing::ValuesIn(cases("import/cases.txt")),
+                         RowName());
 
 // Persons as their contact lines, with the groups they are in; then each group and its members.
 QString dump(const AddressBook& book) {
@@ -223,6 +225,7 @@ TEST_P(Book, Change) {
     qputenv("XDG_DATA_HOME", saved);
 }
 
-INSTANTIATE_TEST_SUITE_P(Rules, Book, ::testing::ValuesIn(cases("addressbook/changes.txt")));
+INSTANTIATE_TEST_SUITE_P(Rules, Book, ::testing::ValuesIn(cases("addressbook/changes.txt")),
+                         RowName());
 
 } // namespace

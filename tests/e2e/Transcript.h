@@ -3,6 +3,8 @@
 // Terminal sessions with the pelmo program, written down in tests/data/cli/ as a user would see
 // them; tests/data/cli/commands.txt tells their form.
 
+#include "RowName.h"
+
 #include <QString>
 #include <gtest/gtest.h>
 
@@ -22,4 +24,4 @@ void playSession(const QString& file, const std::string& name);
     TEST_P(Suite, Session) {                                                                       \
         playSession(file, GetParam().name);                                                        \
     }                                                                                              \
-    INSTANTIATE_TEST_SUITE_P(Cli, Suite, ::testing::ValuesIn(sessionsOf(file)))
+    INSTANTIATE_TEST_SUITE_P(Cli, Suite, ::testing::ValuesIn(sessionsOf(file)), RowName())

@@ -1,3 +1,4 @@
+#include "RowName.h"
 #include "util/CLog.h"
 #include "util/DataFolder.h"
 #include "util/LocalizedStrings.h"
@@ -131,7 +132,7 @@ TEST_P(Texts, Made) {
               (quoted ? expected.mid(1, expected.size() - 2) : expected).toStdString());
 }
 
-INSTANTIATE_TEST_SUITE_P(Util, Texts, ::testing::ValuesIn(rows("texts.txt")));
+INSTANTIATE_TEST_SUITE_P(Util, Texts, ::testing::ValuesIn(rows("texts.txt")), RowName());
 
 // A data home of its own, with no umask to narrow the modes asked for.
 class Home : public ::testing::Test {
@@ -250,7 +251,7 @@ TEST_P(Modes, Private) {
     }
 }
 
-INSTANTIATE_TEST_SUITE_P(Files, Modes, ::testing::ValuesIn(rows("privacy.txt")));
+INSTANTIATE_TEST_SUITE_P(Files, Modes, ::testing::ValuesIn(rows("privacy.txt")), RowName());
 
 } // namespace
 
