@@ -30,12 +30,13 @@ bool readPage(const QString& path, QByteArray& bytes) {
 } // namespace
 
 int relink(const QStringList& args) {
+    constexpr char usage[] = "usage: pelmo relink BASE-URL [FILE]\n";
     if (args == QStringList{QStringLiteral("--help")}) {
-        QTextStream(stdout) << "usage: pelmo relink BASE-URL [FILE]\n";
+        QTextStream(stdout) << usage;
         return 0;
     }
     if (args.isEmpty() || args.size() > 2 || args.first().startsWith(QLatin1Char('-'))) {
-        QTextStream(stderr) << "usage: pelmo relink BASE-URL [FILE]\n";
+        QTextStream(stderr) << usage;
         return 2;
     }
     const QByteArray base = args.first().toUtf8();
