@@ -11,6 +11,7 @@ packages=(
   clang libclang-rt-14-dev
   python3-aiosmtpd openssl
   postfix
+  libxcb1-dev xvfb
 )
 
 missing=()
