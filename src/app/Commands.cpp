@@ -26,6 +26,8 @@ const std::vector<Command> kCommands = {
     {"relink", relink,
      "pelmo relink BASE-URL [FILE]        print FILE (or standard input) relinked against "
      "BASE-URL"},
+    {"front-page", frontPage,
+     "pelmo front-page                    print the address and title of the browser's page"},
 };
 
 } // namespace

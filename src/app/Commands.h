@@ -2,6 +2,8 @@
 
 #include <QStringList>
 
+class PelmoController;
+
 /**
  * The command-line mode: `pelmo COMMAND ARGS...`. Each command takes its own arguments (the
  * command name removed) and answers the process exit status: 0 on success, 1 when the work
@@ -29,5 +31,14 @@ int relink(const QStringList& args);
  * copy was accepted, 1 when any was not (refused, login failed, run halted), 2 on a usage error.
  */
 int send(const QStringList& args);
+
+/**
+ * `front-page`: the address and the title (an empty line when unknown) of the page the web
+ * browser shows; 1, with the alert on standard error, when there is none.
+ */
+int frontPage(const QStringList& args);
+
+/** Asks the controller for the browser's front page and waits for it; false after an alert. */
+bool askFrontPage(PelmoController& controller);
 
 } // namespace Commands

@@ -22,12 +22,12 @@ namespace {
 
 constexpr char kUsage[] =
     "usage: pelmo send [--group NAME | --to ADDRESS [--name NAME]] [--subject TEXT]\n"
-    "                  [--message FILE] [--page URL] [--attach FILE]... [--set KEY=VALUE]...\n"
-    "                  [--dry-run DIR]\n";
+    "                  [--message FILE] [--page URL | --front-page] [--attach FILE]...\n"
+    "                  [--set KEY=VALUE]... [--dry-run DIR]\n";
 
 struct SendOptions {
     QString group, to, name, subject, messageFile, page, dryRunDirectory;
-    bool hasTo = false, hasName = false;
+    bool hasTo = false, hasName = false, frontPage = false;
     QStringList attachments;
     QList<QPair<QString, QString>> settings;
 };
@@ -62,6 +62,8 @@ SendOptions parse(const QStringList& args) {
             options.messageFile = valueAfter(args, i);
         } else if (option == QLatin1String("--page")) {
             options.page = valueAfter(args, i);
+        } else if (option == QLatin1String("--front-page")) {
+            options.frontPage = true;
         } else if (option == QLatin1String("--attach")) {
             options.attachments << valueAfter(args, i);
         } else if (option == QLatin1String("--dry-run")) {
@@ -81,6 +83,8 @@ SendOptions parse(const QStringList& args) {
     }
     if (!options.group.isEmpty() && (options.hasTo || options.hasName))
         throw UsageError(QStringLiteral("--group and --to/--name cannot be used together"));
+    if (options.frontPage && !options.page.isEmpty())
+        throw UsageError(QStringLiteral("--page and --front-page cannot be used together"));
     return options;
 }
 
@@ -127,8 +131,12 @@ bool prepare(PelmoController& controller, AddressBook& book, const SendOptions& 
         view.setTo(options.to);
     if (options.hasName)
         view.setName(options.name);
-    view.setSubject(options.subject);
     view.setWebPageOrFile(options.page);
+    // The browser's page brings its title as the subject, unless one was given.
+    if (options.frontPage && !askFrontPage(controller))
+        return false;
+    if (!options.frontPage || !options.subject.isEmpty())
+        view.setSubject(options.subject);
     if (!options.messageFile.isEmpty())
         loadMessage(options.messageFile, *controller.message());
     QStringList paths;

@@ -91,7 +91,8 @@ SmtpSession* PelmoController::createSession(const QString& host, int port) {
         return sessionFactory(host, port);
     auto* client = new SmtpClient(host, static_cast<quint16>(port),
                                   std::chrono::seconds(defaults.integer(Key::SmtpTimeout)));
-    // Port 465 is implicit TLS by itself; the implicit-TLS setting is for servers that use it elsewhere.
+    // Port 465 is implicit TLS by itself; the implicit-TLS setting is for servers that use it
+    // elsewhere.
     if (defaults.boolean(Key::ImplicitTLS))
         client->setImplicitTLS(true);
     return client;
@@ -124,6 +125,41 @@ void PelmoController::reset() {
     // An unset default recipient leaves the fields empty.
     window.setTo(getDefaultTo());
     window.setName(getDefaultToName());
+}
+
+// The web page
+
+void PelmoController::webPage() {
+    if (frontPageQuery)
+        return;
+    frontPageQuery =
+        frontPagePlaces ? new FrontPageQuery(*frontPagePlaces, this) : new FrontPageQuery(this);
+    connect(frontPageQuery, &FrontPageQuery::finished, this, &PelmoController::frontPageAnswered);
+    frontPageQuery->start();
+}
+
+void PelmoController::setFrontPagePlaces(const FrontPageQuery::Places& places) {
+    frontPagePlaces = places;
+}
+
+void PelmoController::frontPageAnswered(const QString& url, const QString& title,
+                                        const QString& hint, const QString& why) {
+    frontPageQuery->deleteLater();
+    frontPageQuery.clear();
+    if (!why.isEmpty())
+        LogEntry(QStringLiteral("Front page: %1").arg(why).toUtf8().constData());
+    if (url.isNull()) {
+        QString informative =
+            QStringLiteral("Please make sure your browser is running and displaying a web page.");
+        if (!hint.isEmpty())
+            informative += QLatin1Char('\n') + hint;
+        doAlert(QStringLiteral("The front browser web page could not be retreived"), informative);
+    } else {
+        window.setWebPageOrFile(url);
+        if (!title.isNull())
+            window.setSubject(title);
+    }
+    Q_EMIT webPageSettled(!url.isNull());
 }
 
 // Settings and fields

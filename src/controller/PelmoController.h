@@ -1,6 +1,7 @@
 #pragma once
 
 #include "addressbook/Person.h"
+#include "browser/FrontPageQuery.h"
 #include "controller/MailingRun.h"
 #include "controller/PelmoView.h"
 
@@ -86,6 +87,18 @@ public:
     /** Clears the form for a new message: empty body and subject, default recipient. */
     void reset();
 
+    // The web page.
+
+    /**
+     * The Web Page button: asks the browsers for the front page; its address goes into the web
+     * page field and its title (when known) into the subject. Without one, an alert says so
+     * and nothing changes. The answer comes later, then webPageSettled(); a press while a
+     * question is under way is ignored.
+     */
+    void webPage();
+    /** Replaces where the browsers are looked for (tests hand in their own). */
+    void setFrontPagePlaces(const FrontPageQuery::Places& places);
+
     // Settings and fields; those marked "throws" raise PelmoException with the failure's name
     // and reason.
 
@@ -132,10 +145,14 @@ public Q_SLOTS:
 Q_SIGNALS:
     /** The latest run has nothing under way any more: it is over, stopped, stalled or halted. */
     void runSettled();
+    /** The Web Page button's question is answered; found is false when an alert was shown. */
+    void webPageSettled(bool found);
 
 private:
     SmtpSession* createSession(const QString& host, int port);
     void applyCompletionAction(int action);
+    void frontPageAnswered(const QString& url, const QString& title, const QString& hint,
+                           const QString& why);
 
     PelmoView& window;
     AddressBook& addressBook;
@@ -147,4 +164,6 @@ private:
     AttachmentsController* attachments;
     MailingRun::SessionFactory sessionFactory;
     QPointer<MailingRun> run;
+    std::optional<FrontPageQuery::Places> frontPagePlaces;
+    QPointer<FrontPageQuery> frontPageQuery;
 };

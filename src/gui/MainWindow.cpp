@@ -69,6 +69,13 @@ void MainWindow::setController(PelmoController& controller) {
     reportEdits(m_name, PelmoView::Field::Name);
     reportEdits(m_subject, PelmoView::Field::Subject);
     connect(m_sendButton, &QPushButton::clicked, &controller, &PelmoController::send);
+    // Disabled while the browsers are asked, which takes at most a couple of seconds.
+    connect(m_webPageButton, &QPushButton::clicked, &controller, [this] {
+        m_webPageButton->setEnabled(false);
+        m_controller->webPage();
+    });
+    connect(&controller, &PelmoController::webPageSettled, m_webPageButton,
+            [this] { m_webPageButton->setEnabled(true); });
     createActions();
     connectPicker();
 }
@@ -92,7 +99,15 @@ QWidget* MainWindow::createFields() {
     form->addRow(LocalizedStringNS("Recipient Address:"), m_to);
     form->addRow(LocalizedStringNS("Recipients Name:"), m_name);
     form->addRow(LocalizedStringNS("Subject:"), m_subject);
-    form->addRow(LocalizedStringNS("Web Page:"), m_webPageOrFile);
+    // The button beside the field fills it from the page the browser shows.
+    m_webPageButton = new QPushButton(LocalizedStringNS("Web Page"));
+    m_webPageButton->setObjectName(QStringLiteral("webPageButton"));
+    m_webPageButton->setToolTip(
+        LocalizedStringNS("Take the address and title of the page your web browser shows"));
+    auto* page = new QHBoxLayout;
+    page->addWidget(m_webPageOrFile, 1);
+    page->addWidget(m_webPageButton);
+    form->addRow(LocalizedStringNS("Web Page:"), page);
     return fields;
 }
 

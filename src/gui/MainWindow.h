@@ -94,6 +94,7 @@ private:
     QLineEdit* m_to = nullptr;
     QLineEdit* m_name = nullptr;
     QLineEdit* m_webPageOrFile = nullptr;
+    QPushButton* m_webPageButton = nullptr;
     QTextEdit* m_message = nullptr;
     QPushButton* m_sendButton = nullptr;
     QProgressBar* m_spinner = nullptr;
