@@ -9,6 +9,8 @@
 #include <QStringList>
 #include <QTemporaryDir>
 
+#include <functional>
+
 /** A server script started with python3; it prints "PORT n" once listening. */
 class ServerProcess {
 public:
@@ -30,6 +32,28 @@ struct Certificates {
     QString ca, cert, key;
     bool ok = false;
 };
+
+/**
+ * A headless browser of Debian's on a profile of its own, showing url; ended by its own PID when
+ * destroyed. Chromium opens its DevTools endpoint on a port it chooses.
+ */
+class HeadlessBrowser {
+public:
+    enum class Kind { Chromium, FirefoxEsr };
+    HeadlessBrowser(Kind kind, const QString& url);
+    ~HeadlessBrowser();
+    qint64 pid() const { return m_process.processId(); }
+    QString profile() const { return m_profile.path(); }
+    /** Chromium: an HTTP request to the DevTools endpoint; its body, empty on failure. */
+    QByteArray devTools(const QByteArray& method, const QString& path);
+
+private:
+    QTemporaryDir m_profile;
+    QProcess m_process;
+};
+
+/** Polls done (with the event loop running) until it holds or seconds pass. */
+bool eventually(const std::function<bool()>& done, int seconds = 15);
 
 struct PelmoRun {
     int status = -1;
