@@ -8,7 +8,6 @@
 #include <gtest/gtest.h>
 
 #include <cstring>
-#include <functional>
 
 namespace {
 
@@ -29,73 +28,64 @@ QByteArray mozLz4(const QByteArray& text) {
     return out + text;
 }
 
+// A row's file is its json as mozLz4, else the recorded one cut to cut bytes (less -cut) and
+// patched at at (mid-file when -1). It gives "url|title" (a null title shown as ~), or why not.
 struct SessionRow {
     std::string name;
-    std::function<QByteArray(QByteArray)> make;
-    const char *url, *title, *why;
+    int cut, at;
+    const char *patch, *json, *result;
 };
-void PrintTo(const SessionRow& row, std::ostream* out) {
-    *out << row.name;
-}
 
 class SessionRows : public testing::TestWithParam<SessionRow> {};
 
 // The recorded session has two open windows, a closed one and a private one (which Firefox
-// leaves out); the front is the first window's second tab, taken back one page.
-const char* const beta = "http://127.0.0.1:18931/beta.html";
+// leaves out); in front is the first window's second tab, taken back one page. Its header
+// says 4689 bytes (0x1251).
 const SessionRow sessionRows[] = {
-    {"RecordedSecondTabBackOnePage", [](QByteArray f) { return f; }, beta, "Page beta", ""},
-    {"CutInMagic", [](QByteArray f) { return f.left(5); }, "", "", "not a mozLz4 file"},
-    {"CutInSize", [](QByteArray f) { return f.left(10); }, "", "", "truncated mozLz4 header"},
-    {"NoBlock", [](QByteArray f) { return f.left(12); }, "", "", "truncated LZ4 block"},
-    {"CutInBlock", [](QByteArray f) { return f.left(900); }, "", "", "corrupt or truncated"},
-    {"LastByteCut", [](QByteArray f) { return f.chopped(1); }, "", "", "corrupt or truncated"},
-    {"WrongMagic", [](QByteArray f) { return f.replace(3, 1, "Z"); }, "", "", "not a mozLz4"},
-    {"SizeOneMore", [](QByteArray f) { return f.replace(8, 1, QByteArray(1, f[8] + 1)); }, "", "",
-     "LZ4 block of 4689 bytes where the header says 4690"},
-    {"HostileSize", [](QByteArray f) { return f.replace(8, 4, "\xff\xff\xff\x7f"); }, "", "",
-     "session too large"},
-    {"CorruptOffset", [](QByteArray f) { return f.replace(f.size() / 2, 4, "\xff\xff\xff\xff"); },
-     "", "", "corrupt or truncated"},
-    {"NotJson", [](QByteArray) { return mozLz4("windows"); }, "", "", "not a session"},
-    {"NoWindows", [](QByteArray) { return mozLz4(R"({"windows":[],"_closedWindows":[{}]})"); }, "",
-     "", "no windows in the session"},
-    {"SelectedWindowOutOfRange",
-     [](QByteArray) { return mozLz4(R"({"selectedWindow":2,"windows":[{"tabs":[{}]}]})"); }, "", "",
+    {"RecordedSecondTabBackOnePage", 0, 0, "", "", "http://127.0.0.1:18931/beta.html|Page beta"},
+    {"CutInSize", 10, 0, "", "", "truncated mozLz4 header"},
+    {"NoBlock", 12, 0, "", "", "truncated LZ4 block"},
+    {"LastByteCut", -1, 0, "", "", "corrupt or truncated LZ4 block"},
+    {"WrongMagic", 0, 3, "Z", "", "not a mozLz4 file"},
+    {"SizeOneMore", 0, 8, "\x52", "", "LZ4 block of 4689 bytes where the header says 4690"},
+    {"HostileSize", 0, 8, "\xff\xff\xff\x7f", "", "session too large"},
+    {"SizeBeyondAnyBlock", 0, 10, "\x80", "", "truncated LZ4 block"},
+    {"CorruptBlock", 0, -1, "\xff\xff\xff\xff", "", "corrupt or truncated LZ4 block"},
+    {"NotJson", 0, 0, "", "windows", "not a session: illegal value"},
+    {"OnlyClosedWindows", 0, 0, "", R"({"windows":[],"_closedWindows":[{}]})",
+     "no windows in the session"},
+    {"SelectedWindowOutOfRange", 0, 0, "", R"({"selectedWindow":2,"windows":[{"tabs":[{}]}]})",
      "selectedWindow out of range of the windows"},
-    {"DefaultsFirstWindowLastEntryNullTitle",
-     [](QByteArray) {
-         return mozLz4(R"({"selectedWindow":0,"windows":[{"tabs":[{"entries":[{"url":"a"},)"
-                       R"({"url":"b"}]}]}, {}],"padding":")" +
-                       QByteArray(300, 'x') + "\"}");
-     },
-     "b", nullptr, ""},
-    {"EmptyUrl", [](QByteArray) { return mozLz4(R"({"windows":[{"tabs":[{"entries":[{}]}]}]})"); },
-     "", "", "the front page has no address"},
+    {"IndexOutOfRange", 0, 0, "", R"({"windows":[{"tabs":[{"index":2,"entries":[{"url":"a"}]}]}]})",
+     "index out of range of the entries"},
+    {"DefaultsFirstWindowLastEntryNullTitle", 0, 0, "",
+     R"({"selectedWindow":0,"windows":[{"tabs":[{"entries":[{"url":"a"},{"url":"b"}]}]},{}]})",
+     "b|~"},
+    {"EmptyUrl", 0, 0, "", R"({"windows":[{"tabs":[{"entries":[{"url":""}]}]}]})",
+     "the front page has no address"},
 };
 
 TEST_P(SessionRows, FrontPage) {
     const SessionRow& row = GetParam();
+    QByteArray file = *row.json ? mozLz4(row.json) : recorded();
+    file = row.cut < 0 ? file.chopped(-row.cut) : row.cut ? file.left(row.cut) : file;
+    if (*row.patch)
+        file.replace(row.at < 0 ? file.size() / 2 : row.at, qsizetype(strlen(row.patch)),
+                     row.patch);
     QString why;
-    const QByteArray json = FirefoxSession::decodeMozLz4(row.make(recorded()), &why);
+    const QByteArray json = FirefoxSession::decodeMozLz4(file, &why);
     const auto page = json.isNull() ? std::nullopt : FirefoxSession::frontPage(json, &why);
-    EXPECT_EQ(why.left(qsizetype(strlen(row.why))), row.why);
-    EXPECT_EQ(page.has_value(), !*row.why);
-    if (page) {
-        EXPECT_EQ(page->url, row.url);
-        EXPECT_EQ(page->title, row.title);
-        EXPECT_EQ(page->title.isNull(), !row.title);
-    }
+    EXPECT_EQ(page ? page->url + '|' + (page->title.isNull() ? "~" : page->title) : why,
+              row.result);
 }
 INSTANTIATE_TEST_SUITE_P(Firefox, SessionRows, testing::ValuesIn(sessionRows), RowName());
 
+// A fake home: its ini files, the command line, and files: "folder:+pid" makes a lock, and a
+// bare folder a session file, each listed one minute newer than the one before; ~ is the home.
 struct ProfileRow {
     std::string name;
-    const char *profiles, *installs, *args, *locks, *sessions, *folder;
+    const char *profiles, *installs, *args, *files, *folder;
 };
-void PrintTo(const ProfileRow& row, std::ostream* out) {
-    *out << row.name;
-}
 
 class ProfileRows : public testing::TestWithParam<ProfileRow> {};
 
@@ -103,19 +93,19 @@ const char* const twoProfiles =
     "[General]\nStartWithLastProfile=1\n[Profile1]\nName=home\nIsRelative=1\nPath=a.home\n"
     "Default=1\n\n[Profile0]\nName=work\nIsRelative=0\nPath=/srv/w.work\n";
 const ProfileRow profileRows[] = {
-    {"ProfileWithEquals", twoProfiles, "", "ff --profile=/x/y", "", "", "/x/y"},
-    {"ProfileBeforeUrl", twoProfiles, "", "ff -profile /x/p http://a", "", "", "/x/p"},
-    {"NamedByP", twoProfiles, "", "ff -P work", "", "", "/srv/w.work"},
-    {"UnknownName", twoProfiles, "", "ff -P play", "", "", "no profile named play in"},
+    {"ProfileWithEquals", twoProfiles, "", "ff --profile=/x/y", "", "/x/y"},
+    {"ProfileBeforeUrl", twoProfiles, "", "ff -profile /x/p http://a", "", "/x/p"},
+    {"NamedByP", twoProfiles, "", "ff -P work", "", "/srv/w.work"},
+    {"UnknownName", twoProfiles, "", "ff -P play", "", "no profile named play in profiles.ini"},
     {"LockNamesThisPid",
      "[Profile0]\nIsRelative=1\nPath=a\nDefault=1\n[Profile1]\nIsRelative=1\nPath=b\n", "", "ff",
-     "a:+424 b:+4242", "", "b"},
+     "a:+424 b:+4242", "~/b"},
     {"NewestInstallDefault", twoProfiles, "[X]\nDefault=a\n[Y]\nDefault=b\n[Z]\nDefault=c\n", "ff",
-     "", "a c b", "b"},
+     "a c b", "~/b"},
     {"InstallInProfilesIni", "[Profile0]\nIsRelative=1\nPath=a\n[InstallX]\nDefault=c\n", "", "ff",
-     "", "", "c"},
-    {"DefaultOne", twoProfiles, "", "ff", "", "", "a.home"},
-    {"NoProfilesIni", "", "", "ff", "", "", "no profiles.ini in"},
+     "", "~/c"},
+    {"DefaultOne", twoProfiles, "", "ff", "", "~/a.home"},
+    {"NoProfilesIni", "", "", "ff", "", "no profiles.ini in"},
 };
 
 TEST_P(ProfileRows, ProfileFolder) {
@@ -126,26 +116,22 @@ TEST_P(ProfileRows, ProfileFolder) {
         return !*text || (file.open(QIODevice::WriteOnly) && file.write(text) >= 0);
     };
     ASSERT_TRUE(write("profiles.ini", row.profiles) && write("installs.ini", row.installs));
-    for (const QString& lock : QString(row.locks).split(' ', Qt::SkipEmptyParts)) {
-        QDir(home.path()).mkpath(lock.section(':', 0, 0));
-        QFile::link("127.0.0.1:" + lock.section(':', 1),
-                    home.filePath(lock.section(':', 0, 0)) + "/lock");
-    }
-    const QStringList sessions = QString(row.sessions).split(' ', Qt::SkipEmptyParts);
-    for (qsizetype i = 0; i < sessions.size(); ++i) {
-        QDir(home.path()).mkpath(sessions[i] + "/sessionstore-backups");
-        QFile file(home.filePath(sessions[i] + "/sessionstore-backups/recovery.jsonlz4"));
-        ASSERT_TRUE(file.open(QIODevice::WriteOnly));
-        file.setFileTime(QDateTime::currentDateTime().addSecs(i * 60 - 600),
-                         QFileDevice::FileModificationTime);
+    const QStringList files = QString(row.files).split(' ', Qt::SkipEmptyParts);
+    for (qsizetype i = 0; i < files.size(); ++i) {
+        const QString folder = files[i].section(':', 0, 0);
+        QDir(home.path()).mkpath(folder + "/sessionstore-backups");
+        QFile file(home.filePath(folder + "/sessionstore-backups/recovery.jsonlz4"));
+        ASSERT_TRUE(files[i].contains(':')
+                        ? QFile::link("127.0.0.1:" + files[i].section(':', 1),
+                                      home.filePath(folder + "/lock"))
+                        : file.open(QIODevice::WriteOnly) &&
+                              file.setFileTime(QDateTime::currentDateTime().addSecs(i * 60),
+                                               QFileDevice::FileModificationTime));
     }
     QString why;
     const QString folder =
         FirefoxSession::profileFolder(home.path(), QString(row.args).split(' '), 4242, &why);
-    const QString expected =
-        QString(row.folder).startsWith("/") || QString(row.folder).contains(' ')
-            ? row.folder
-            : home.filePath(row.folder);
+    const QString expected = QString(row.folder).replace("~", home.path());
     EXPECT_EQ(folder.isNull() ? why.left(expected.size()) : folder, expected);
 }
 INSTANTIATE_TEST_SUITE_P(Firefox, ProfileRows, testing::ValuesIn(profileRows), RowName());
