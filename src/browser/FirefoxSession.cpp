@@ -11,6 +11,7 @@
 #include <lz4.h>
 
 #include <climits>
+#include <cmath>
 #include <unistd.h>
 
 namespace {
@@ -34,6 +35,8 @@ QList<IniSection> readIni(const QString& path) {
     if (!file.open(QIODevice::ReadOnly))
         return sections;
     for (const QByteArray& raw : file.read(1024 * 1024).split('\n')) {
+        if (raw.contains('\0')) // no path holds one; Qt warns of every such name it is given
+            continue;
         const QString line = QString::fromUtf8(raw).trimmed();
         if (line.startsWith('[') && line.endsWith(']'))
             sections.append({line.mid(1, line.size() - 2), {}});
@@ -52,8 +55,9 @@ std::optional<qint64> position(const QJsonObject& object, const QString& key, qi
     const QJsonValue value = object.value(key);
     if (value.isUndefined())
         return fallback;
-    const double number = value.toDouble(-1);
-    if (!value.isDouble() || number != static_cast<double>(static_cast<qint64>(number)))
+    // Checked before the cast: a double beyond qint64 does not convert.
+    const double number = value.toDouble();
+    if (!value.isDouble() || std::abs(number) > 1e9 || number != std::floor(number))
         return std::nullopt;
     return static_cast<qint64>(number);
 }
