@@ -78,13 +78,15 @@ TEST_P(SessionRows, FrontPage) {
     QString why;
     const QByteArray json = FirefoxSession::decodeMozLz4(file, &why);
     const auto page = json.isNull() ? std::nullopt : FirefoxSession::frontPage(json, &why);
-    EXPECT_EQ(page ? page->url + '|' + (page->title.isNull() ? "~" : page->title) : why,
-              row.result);
+    const QString result =
+        page ? page->url + '|' + (page->title.isNull() ? "~" : page->title) : why;
+    EXPECT_EQ(result.toStdString(), row.result);
 }
 INSTANTIATE_TEST_SUITE_P(Firefox, SessionRows, testing::ValuesIn(sessionRows), RowName());
 
 // A fake home: its ini files, the command line, and files: "folder:+pid" makes a lock, and a
-// bare folder a session file, each listed one minute newer than the one before; ~ is the home.
+// bare folder the recorded session, each listed one minute newer than the one before. The row
+// gives the folder found (~ is the home) and the title read there, or why none was found.
 struct ProfileRow {
     std::string name;
     const char *profiles, *installs, *args, *files, *folder;
@@ -104,11 +106,11 @@ const ProfileRow profileRows[] = {
      "[Profile0]\nIsRelative=1\nPath=a\nDefault=1\n[Profile1]\nIsRelative=1\nPath=b\n", "", "ff",
      "a:+424 b:+4242", "~/b"},
     {"NewestInstallDefault", twoProfiles, "[X]\nDefault=a\n[Y]\nDefault=b\n[Z]\nDefault=c\n", "ff",
-     "a c b", "~/b"},
+     "a c b", "~/b Page beta"},
     {"InstallInProfilesIni", "[Profile0]\nIsRelative=1\nPath=a\n[InstallX]\nDefault=c\n", "", "ff",
      "", "~/c"},
     {"DefaultOne", twoProfiles, "", "ff", "", "~/a.home"},
-    {"NoProfilesIni", "", "", "ff", "", "no profiles.ini in"},
+    {"NoProfilesIni", "", "", "ff", "", "no profiles.ini in ~"},
 };
 
 TEST_P(ProfileRows, ProfileFolder) {
@@ -127,15 +129,16 @@ TEST_P(ProfileRows, ProfileFolder) {
         ASSERT_TRUE(files[i].contains(':')
                         ? QFile::link("127.0.0.1:" + files[i].section(':', 1),
                                       home.filePath(folder + "/lock"))
-                        : file.open(QIODevice::WriteOnly) &&
+                        : file.open(QIODevice::WriteOnly) && file.write(recorded()) > 0 &&
                               file.setFileTime(QDateTime::currentDateTime().addSecs(i * 60),
                                                QFileDevice::FileModificationTime));
     }
     QString why;
     const QString folder =
         FirefoxSession::profileFolder(home.path(), QString(row.args).split(' '), 4242, &why);
-    const QString expected = QString(row.folder).replace("~", home.path());
-    EXPECT_EQ(folder.isNull() ? why.left(expected.size()) : folder, expected);
+    const auto page = folder.isNull() ? std::nullopt : FirefoxSession::read(folder, &why);
+    const QString result = folder.isNull() ? why : page ? folder + ' ' + page->title : folder;
+    EXPECT_EQ(result.toStdString(), QString(row.folder).replace("~", home.path()).toStdString());
 }
 INSTANTIATE_TEST_SUITE_P(Firefox, ProfileRows, testing::ValuesIn(profileRows), RowName());
 
