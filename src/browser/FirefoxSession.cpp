@@ -108,7 +108,9 @@ std::optional<FrontPage> FirefoxSession::frontPage(const QByteArray& json, QStri
     QJsonParseError error;
     const QJsonDocument document = QJsonDocument::fromJson(json, &error);
     if (!document.isObject())
-        return fail(why, QStringLiteral("not a session: %1").arg(error.errorString())),
+        return fail(why, QStringLiteral("not a session: %1")
+                             .arg(error.error ? error.errorString()
+                                              : QStringLiteral("no object at the top"))),
                std::nullopt;
     // Closed windows are kept apart, in _closedWindows; selectedWindow counts open ones only.
     QJsonObject session = document.object();

@@ -52,6 +52,7 @@ const SessionRow sessionRows[] = {
     {"SizeBeyondAnyBlock", 0, 10, "\x80", "", "truncated LZ4 block"},
     {"CorruptBlock", 0, -1, "\xff\xff\xff\xff", "", "corrupt or truncated LZ4 block"},
     {"NotJson", 0, 0, "", "windows", "not a session: illegal value"},
+    {"ArrayNotObject", 0, 0, "", "[]", "not a session: no object at the top"},
     {"OnlyClosedWindows", 0, 0, "", R"({"windows":[],"_closedWindows":[{}]})",
      "no windows in the session"},
     {"SelectedWindowOutOfRange", 0, 0, "", R"({"selectedWindow":2,"windows":[{"tabs":[{}]}]})",
