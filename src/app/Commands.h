@@ -2,6 +2,9 @@
 
 #include <QStringList>
 
+#include <functional>
+
+class AddressBook;
 class PelmoController;
 
 /**
@@ -37,6 +40,14 @@ int send(const QStringList& args);
  * browser shows; 1, with the alert on standard error, when there is none.
  */
 int frontPage(const QStringList& args);
+
+/**
+ * Runs work on a controller over the console, with the user's address book, settings and
+ * keyring and the activity log open; startUp first when asked (it prints "Ready."). A settings
+ * failure is printed after "pelmo COMMAND: " and answers 1.
+ */
+int onConsole(const char* command, bool startUp,
+              const std::function<int(PelmoController&, AddressBook&)>& work);
 
 /** Asks the controller for the browser's front page and waits for it; false after an alert. */
 bool askFrontPage(PelmoController& controller);

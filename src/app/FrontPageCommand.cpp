@@ -1,11 +1,6 @@
 #include "app/Commands.h"
 
-#include "addressbook/AddressBook.h"
-#include "app/ConsoleView.h"
-#include "controller/MailSettings.h"
-#include "controller/PasswordStore.h"
 #include "controller/PelmoController.h"
-#include "util/PelmoException.h"
 
 #include <QCoreApplication>
 #include <QTextStream>
@@ -14,12 +9,14 @@ namespace Commands {
 
 bool askFrontPage(PelmoController& controller) {
     bool found = false;
-    QObject::connect(&controller, &PelmoController::webPageSettled, [&found](bool answer) {
-        found = answer;
-        QCoreApplication::exit(0);
-    });
+    const QMetaObject::Connection answered =
+        QObject::connect(&controller, &PelmoController::webPageSettled, [&found](bool answer) {
+            found = answer;
+            QCoreApplication::exit(0);
+        });
     QMetaObject::invokeMethod(&controller, &PelmoController::webPage, Qt::QueuedConnection);
     QCoreApplication::exec();
+    QObject::disconnect(answered);
     return found;
 }
 
@@ -30,22 +27,13 @@ int frontPage(const QStringList& args) {
                "  prints the address and the title of the page the web browser shows\n";
         return args.first() == QLatin1String("--help") ? 0 : 2;
     }
-    try {
-        ConsoleView view;
-        AddressBook book;
-        MailSettings settings;
-        PasswordStore passwords;
-        PelmoController controller(view, book, passwords, settings);
-        controller.applicationWillFinishLaunching();
-        const bool found = askFrontPage(controller);
-        controller.applicationWillTerminate();
-        if (found)
-            QTextStream(stdout) << view.webPageOrFile() << '\n' << view.subject() << '\n';
-        return found ? 0 : 1;
-    } catch (const PelmoException& failure) {
-        QTextStream(stderr) << "pelmo front-page: " << failure.reason() << '\n';
-        return 1;
-    }
+    return onConsole("front-page", false, [](PelmoController& controller, AddressBook&) {
+        if (!askFrontPage(controller))
+            return 1;
+        const PelmoView& view = controller.view();
+        QTextStream(stdout) << view.webPageOrFile() << '\n' << view.subject() << '\n';
+        return 0;
+    });
 }
 
 } // namespace Commands

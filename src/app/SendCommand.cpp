@@ -183,19 +183,27 @@ int send(const QStringList& args) {
         QTextStream(stderr) << "pelmo send: " << problem << '\n';
         return 1;
     }
+    return onConsole("send", true, [&options](PelmoController& controller, AddressBook& book) {
+        return prepare(controller, book, options) ? runMailing(controller) : 1;
+    });
+}
+
+int onConsole(const char* command, bool startUp,
+              const std::function<int(PelmoController&, AddressBook&)>& work) {
     try {
         ConsoleView view;
         AddressBook book;
         MailSettings settings;
         PasswordStore passwords;
         PelmoController controller(view, book, passwords, settings);
-        controller.startUp();
+        if (startUp)
+            controller.startUp();
         controller.applicationWillFinishLaunching();
-        const int status = prepare(controller, book, options) ? runMailing(controller) : 1;
+        const int status = work(controller, book);
         controller.applicationWillTerminate();
         return status;
     } catch (const PelmoException& failure) {
-        QTextStream(stderr) << "pelmo send: " << failure.reason() << '\n';
+        QTextStream(stderr) << "pelmo " << command << ": " << failure.reason() << '\n';
         return 1;
     }
 }

@@ -15,8 +15,8 @@ struct BrowserKind {
     QString name; ///< as the user knows it, "Firefox ESR"
     BrowserFamily family;
     QStringList programs; ///< process names (comm, at most 15 bytes) and executable names
-    QString folder;       ///< Firefox: its home under $HOME; Chromium: its user data under
-                          ///< $XDG_CONFIG_HOME
+    QString folder;       ///< Firefox: its home under $HOME (or, without the dot, under
+                          ///< $XDG_CONFIG_HOME); Chromium: its user data under $XDG_CONFIG_HOME
 };
 
 /** Every browser Pelmo knows, in no particular order. */

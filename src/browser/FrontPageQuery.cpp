@@ -6,6 +6,7 @@
 #include "browser/PageDownload.h"
 
 #include <QDir>
+#include <QFileInfo>
 #include <QStandardPaths>
 #include <QTimer>
 
@@ -55,9 +56,12 @@ void FrontPageQuery::ask(Answer& answer) {
     const QString name = browser.kind->name;
     if (browser.kind->family == BrowserFamily::Firefox) {
         QString why;
-        const QString profile =
-            FirefoxSession::profileFolder(QDir(m_places.home).filePath(browser.kind->folder),
-                                          browser.process.arguments, browser.process.pid, &why);
+        // Newer releases keep the profiles under $XDG_CONFIG_HOME, without the leading dot.
+        QString home = QDir(m_places.home).filePath(browser.kind->folder);
+        if (!QFileInfo::exists(home + QLatin1String("/profiles.ini")))
+            home = QDir(m_places.configHome).filePath(browser.kind->folder.mid(1));
+        const QString profile = FirefoxSession::profileFolder(home, browser.process.arguments,
+                                                              browser.process.pid, &why);
         if (!profile.isEmpty())
             answer.page = FirefoxSession::read(profile, &why);
         if (!answer.page)

@@ -1,10 +1,13 @@
 #include "QtTestMain.h"
 #include "RowName.h"
+#include "browser/ChromiumDevTools.h"
 #include "browser/DesktopWindows.h"
+#include "browser/FirefoxSession.h"
 #include "browser/FrontPageQuery.h"
 #include "e2e/E2eSupport.h"
 #include "gui/GuiFixture.h"
 
+#include <QDateTime>
 #include <QDir>
 #include <QFile>
 
@@ -13,9 +16,9 @@
 namespace {
 
 // A /proc tree of the processes given as "pid parent started comm exe arguments...".
-void writeProcesses(const QString& root, const std::vector<const char*>& processes) {
-    for (const char* line : processes) {
-        const QStringList f = QString::fromLatin1(line).split(' ');
+void writeProcesses(const QString& root, const QStringList& processes) {
+    for (const QString& line : processes) {
+        const QStringList f = line.trimmed().split(' ');
         const QString dir = root + '/' + f[0] + '/';
         QDir().mkpath(dir);
         QFile stat(dir + "stat"), comm(dir + "comm"), cmdline(dir + "cmdline");
@@ -31,57 +34,130 @@ void writeProcesses(const QString& root, const std::vector<const char*>& process
     }
 }
 
-struct PreferenceRow {
-    std::string name;
-    std::vector<const char*> processes;
-    QList<qint64> front; // the owners of the windows, front first
-    qint64 title, url;   // the pid asked, 0 for none
-};
-
-class Preference : public ::testing::TestWithParam<PreferenceRow> {};
-
-TEST_P(Preference, PicksTheBrowserToAsk) {
-    const PreferenceRow& row = GetParam();
-    QTemporaryDir root;
-    writeProcesses(root.path(), row.processes);
-    const ProcessTable processes(root.path());
-    const QList<RunningBrowser> running = FindRunningBrowsers(processes);
-    const auto title = GetRunningBrowserNameScript(running, processes, row.front);
-    const auto url = GetRunningBrowserURLScript(running, processes, row.front);
-    EXPECT_EQ(title ? title->process.pid : 0, row.title);
-    EXPECT_EQ(url ? url->process.pid : 0, row.url);
+QByteArray recorded() {
+    QFile file(PELMO_TEST_DATA "/browser/two-windows.jsonlz4");
+    EXPECT_TRUE(file.open(QIODevice::ReadOnly));
+    return file.readAll();
 }
 
-const char* kShell = "50 1 5 bash bash -bash";
-const char* kChromium = "80 1 8 chromium chromium /usr/lib/chromium/chromium";
-const char* kFirefox = "60 1 6 firefox firefox /usr/lib/firefox/firefox";
-const char* kLibreWolf = "70 1 7 librewolf librewolf librewolf";
+// text as a mozLz4 file whose LZ4 block is one run of literals.
+QByteArray mozLz4(const QByteArray& text) {
+    QByteArray out("mozLz40\0", 8);
+    for (int shift = 0; shift < 32; shift += 8)
+        out += char(text.size() >> shift);
+    out += char(std::min<qsizetype>(text.size(), 15) << 4);
+    for (qsizetype rest = text.size() - 15; rest >= 0; rest -= 255)
+        out += char(std::min<qsizetype>(rest, 255));
+    return out + text;
+}
 
-INSTANTIATE_TEST_SUITE_P(
-    Browsers, Preference,
-    ::testing::Values(
-        PreferenceRow{"NoBrowserNoneAsked", {kShell}, {50}, 0, 0},
-        PreferenceRow{"OneBrowserAnswersBoth", {kShell, kLibreWolf}, {}, 70, 70},
-        PreferenceRow{"TitleFromFirefoxAddressFromLibreWolf", {kFirefox, kLibreWolf}, {}, 60, 70},
-        PreferenceRow{"ChromiumBeforeFirefox", {kFirefox, kChromium}, {}, 80, 80},
-        PreferenceRow{"RendererIsNotTheBrowser",
-                      {kChromium, "81 80 9 chromium chromium chromium --type=renderer"},
-                      {},
-                      80,
-                      80},
-        PreferenceRow{"FrontWindowBeatsPreference", {kFirefox, kChromium}, {60}, 60, 60},
-        PreferenceRow{"ContentProcessWindowIsItsBrowsers",
-                      {kFirefox, kChromium, "61 60 9 Web_Content firefox firefox -contentproc"},
-                      {61},
-                      60,
-                      60},
-        PreferenceRow{
-            "TopmostBrowserBelowTheTerminal", {kShell, kFirefox, kChromium}, {50, 60}, 60, 60},
-        PreferenceRow{
-            "LatestStartedOfTwo", {kChromium, "90 1 20 chromium chromium chromium"}, {}, 90, 90},
-        PreferenceRow{
-            "KnownByItsExecutable", {"65 1 6 MainThread firefox-esr firefox-esr"}, {}, 65, 65}),
-    RowName());
+QString pageText(const std::optional<FrontPage>& page, const QString& why) {
+    return page ? page->url + '|' + (page->title.isNull() ? "~" : page->title) : why;
+}
+
+QString prefer(const QString& input) {
+    QStringList processes = input.split(" ; ");
+    QList<qint64> front;
+    if (processes[0].startsWith("front="))
+        for (const QString& pid : processes.takeFirst().mid(6).split(','))
+            front << pid.toLongLong();
+    QTemporaryDir root;
+    writeProcesses(root.path(), processes);
+    const ProcessTable table(root.path());
+    const QList<RunningBrowser> running = FindRunningBrowsers(table);
+    const auto title = GetRunningBrowserNameScript(running, table, front);
+    const auto url = GetRunningBrowserURLScript(running, table, front);
+    return QString("title=%1 url=%2")
+        .arg(title ? title->process.pid : 0)
+        .arg(url ? url->process.pid : 0);
+}
+
+QString session(const QString& input) {
+    QByteArray file = input.startsWith("recorded") ? recorded() : mozLz4(input.toUtf8());
+    const QStringList options =
+        input.startsWith("recorded") ? input.split(' ').mid(1) : QStringList();
+    for (const QString& option : options) {
+        const int at = option.section('=', 1).section(':', 0, 0).toInt();
+        const QByteArray bytes = QByteArray::fromHex(option.section(':', 1).toLatin1());
+        if (option.startsWith("cut="))
+            file = at < 0 ? file.chopped(-at) : file.left(at);
+        else
+            file.replace(at < 0 ? file.size() / 2 : at, bytes.size(), bytes);
+    }
+    QString why;
+    const QByteArray json = FirefoxSession::decodeMozLz4(file, &why);
+    return pageText(json.isNull() ? std::nullopt : FirefoxSession::frontPage(json, &why), why);
+}
+
+QString profile(const QString& input) {
+    QStringList f = input.split('|');
+    for (QString& field : f)
+        field =
+            field.trimmed()
+                .replace("\\n", "\n")
+                .replace("@two",
+                         "[General]\nStartWithLastProfile=1\n[Profile1]\nName=home\nIsRelative=1\n"
+                         "Path=a.home\nDefault=1\n\n[Profile0]\nName=work\nIsRelative=0\nPath=/srv/"
+                         "w.work\n");
+    QTemporaryDir home;
+    for (const auto& [name, text] : {std::pair("profiles.ini", f[0]), {"installs.ini", f[1]}}) {
+        QFile file(home.filePath(name));
+        EXPECT_TRUE(text.isEmpty() ||
+                    (file.open(QIODevice::WriteOnly) && file.write(text.toUtf8())));
+    }
+    const QStringList files = f[3].split(' ', Qt::SkipEmptyParts);
+    for (qsizetype i = 0; i < files.size(); ++i) {
+        const QString folder = files[i].section(':', 0, 0);
+        QDir(home.path()).mkpath(folder + "/sessionstore-backups");
+        QFile file(home.filePath(folder + "/sessionstore-backups/recovery.jsonlz4"));
+        EXPECT_TRUE(files[i].contains(':')
+                        ? QFile::link("127.0.0.1:" + files[i].section(':', 1),
+                                      home.filePath(folder + "/lock"))
+                        : file.open(QIODevice::WriteOnly) && file.write(recorded()) > 0 &&
+                              file.setFileTime(QDateTime::currentDateTime().addSecs(i * 60),
+                                               QFileDevice::FileModificationTime));
+    }
+    QString why;
+    const QString folder = FirefoxSession::profileFolder(home.path(), f[2].split(' '), 4242, &why);
+    const auto page = folder.isNull() ? std::nullopt : FirefoxSession::read(folder, &why);
+    QString found = folder.isNull() ? why : page ? folder + ' ' + page->title : folder;
+    return found.replace(home.path(), "~");
+}
+
+struct Row {
+    std::string name;
+    QString reader, input, gives;
+};
+
+std::vector<Row> rows() {
+    QFile data(PELMO_TEST_DATA "/browser/reads.txt");
+    EXPECT_TRUE(data.open(QIODevice::ReadOnly));
+    std::vector<Row> rows;
+    for (const QString& line : QString::fromUtf8(data.readAll()).split('\n')) {
+        const QStringList words = line.section(" => ", 0, 0).split(' ', Qt::SkipEmptyParts);
+        if (!line.isEmpty() && !line.startsWith('#'))
+            rows.push_back({words[0].toStdString(), words[1],
+                            line.section(" => ", 0, 0).section(words[1], 1).trimmed(),
+                            line.section(" => ", 1)});
+    }
+    return rows;
+}
+
+class Reads : public ::testing::TestWithParam<Row> {};
+
+TEST_P(Reads, Give) {
+    const Row& row = GetParam();
+    QString why;
+    const QString given =
+        row.reader == "prefer"    ? prefer(row.input)
+        : row.reader == "session" ? session(row.input)
+        : row.reader == "profile"
+            ? profile(row.input)
+            : pageText(ChromiumDevTools::frontPage(row.input.toUtf8(), &why), why);
+    EXPECT_EQ(given.toStdString(), row.gives.toStdString());
+}
+
+INSTANTIATE_TEST_SUITE_P(Browsers, Reads, ::testing::ValuesIn(rows()), RowName());
 
 xcb_atom_t atom(xcb_connection_t* x, const char* name) {
     xcb_intern_atom_reply_t* reply =
@@ -131,22 +207,31 @@ QString frontPage() {
     return run.out + run.err + QString::number(run.status);
 }
 
-class RealBrowser : public ::testing::Test {
+// pelmo front-page and the window's Web Page button, which fills the web page field and the
+// subject, or alerts and keeps what they held.
+class FrontPage : public GuiFixture {
 protected:
     ServerProcess pages{PELMO_TEST_DIR "/controller/page_server.py",
                         {PELMO_TEST_DATA "/browser/www"}};
     const QString base = QString("http://127.0.0.1:%1/").arg(pages.port());
     QString shown;
     bool shows(const QString& expected) {
-        return eventually([&] { return (shown = frontPage()) == expected; });
+        return waitUntil([&] { return (shown = frontPage()) == expected; }, 15000);
+    }
+    QString pressed() {
+        QTest::mouseClick(child<QPushButton>("webPageButton"), Qt::LeftButton);
+        EXPECT_TRUE(waitUntil([this] { return child<QPushButton>("webPageButton")->isEnabled(); }));
+        return child<QLineEdit>("webPageOrFile")->text() + " | " +
+               child<QLineEdit>("subject")->text();
     }
 };
 
-TEST_F(RealBrowser, ChromiumsFrontTab) {
-    HeadlessBrowser chromium(HeadlessBrowser::Kind::Chromium, base + "alpha.html");
+TEST_F(FrontPage, FromChromium) {
+    HeadlessBrowser chromium(HeadlessBrowser::Kind::Chromium, {base + "alpha.html"});
     EXPECT_TRUE(shows(base + "alpha.html\nAlpha page\n0")) << shown.toStdString();
+    EXPECT_EQ(pressed(), base + "alpha.html | Alpha page");
     // A new tab comes to the front, its title given HTML-escaped by Chromium.
-    chromium.devTools("PUT", "/json/new?" + base + "beta.html");
+    chromium.openTab(base + "beta.html");
     EXPECT_TRUE(shows(base + "beta.html\nBeta & more\n0")) << shown.toStdString();
 
     // pelmo send --front-page mails that page with its title as the subject.
@@ -165,58 +250,27 @@ TEST_F(RealBrowser, ChromiumsFrontTab) {
     EXPECT_TRUE(message.parts.value(1).content.contains("<p>Beta</p>"));
 
     // A browser started with a fixed port is asked on that port, its user data unknown.
-    QFile portFile(chromium.profile() + "/DevToolsActivePort");
-    ASSERT_TRUE(portFile.open(QIODevice::ReadOnly));
-    const QByteArray port = portFile.readLine().trimmed();
-    QTemporaryDir root, config;
-    writeProcesses(
-        root.path(),
-        {("99 1 5 chromium chromium chromium --remote-debugging-port=" + port).constData()});
-    FrontPageQuery query({root.path(), config.path(), config.path(), false}, nullptr);
-    QObject::connect(&query, &FrontPageQuery::finished,
-                     [&](const QString& url, const QString& title) { shown = url + ' ' + title; });
-    query.start();
-    EXPECT_TRUE(eventually([&] { return query.state() == FrontPageQuery::State::Finished; }));
-    EXPECT_EQ(shown, base + "beta.html Beta & more");
+    QFile port(chromium.profile() + "/DevToolsActivePort");
+    ASSERT_TRUE(port.open(QIODevice::ReadOnly));
+    QTemporaryDir root;
+    writeProcesses(root.path(), {"99 1 5 chromium chromium chromium --remote-debugging-port=" +
+                                 port.readLine().trimmed()});
+    pelmo->setFrontPagePlaces({root.path(), root.path(), root.path(), false});
+    EXPECT_EQ(pressed(), base + "beta.html | Beta & more");
 }
 
-TEST_F(RealBrowser, FirefoxsSelectedTab) {
-    HeadlessBrowser firefox(HeadlessBrowser::Kind::FirefoxEsr, base + "beta.html");
+TEST_F(FrontPage, FromFirefox) {
+    HeadlessBrowser firefox(HeadlessBrowser::Kind::FirefoxEsr,
+                            {base + "beta.html", base + "alpha.html"});
     EXPECT_TRUE(shows(base + "beta.html\nBeta & more\n0")) << shown.toStdString();
 }
 
-// The Web Page button: the front page's address and title fill the two fields; without one,
-// the alert says what to do and the fields keep what they held.
-class WebPageButton : public GuiFixture {
-protected:
-    QString fields() const {
-        return child<QLineEdit>("webPageOrFile")->text() + " | " +
-               child<QLineEdit>("subject")->text();
-    }
-    void press() {
-        QTest::mouseClick(child<QPushButton>("webPageButton"), Qt::LeftButton);
-        ASSERT_TRUE(
-            eventually([this] { return child<QPushButton>("webPageButton")->isEnabled(); }));
-    }
-};
-
-TEST_F(WebPageButton, FillsTheFieldsFromChromium) {
-    ServerProcess pages{PELMO_TEST_DIR "/controller/page_server.py",
-                        {PELMO_TEST_DATA "/browser/www"}};
-    const QString page = QString("http://127.0.0.1:%1/beta.html").arg(pages.port());
-    HeadlessBrowser chromium(HeadlessBrowser::Kind::Chromium, page);
-    EXPECT_TRUE(eventually([&] {
-        press();
-        return fields() == page + " | Beta & more";
-    })) << fields().toStdString();
-}
-
-TEST_F(WebPageButton, AlertsAndKeepsTheFieldsWithoutAPage) {
+TEST_F(FrontPage, AlertWithoutAPage) {
     QTemporaryDir root;
     writeProcesses(root.path(), {"80 1 8 chromium chromium chromium"});
     pelmo->setFrontPagePlaces({root.path(), root.path(), root.path(), false});
     QTest::keyClicks(child<QLineEdit>("subject"), "Kept");
-    press();
+    EXPECT_EQ(pressed(), " | Kept");
     auto* box = asked<QMessageBox>();
     ASSERT_NE(box, nullptr);
     EXPECT_EQ(box->text() + '\n' + box->informativeText(),
@@ -224,7 +278,6 @@ TEST_F(WebPageButton, AlertsAndKeepsTheFieldsWithoutAPage) {
               "Please make sure your browser is running and displaying a web page.\n"
               "To let Pelmo read Chromium's page, start it with --remote-debugging-port=9222.");
     box->accept();
-    EXPECT_EQ(fields(), " | Kept");
 }
 
 } // namespace

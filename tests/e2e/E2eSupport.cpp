@@ -1,14 +1,10 @@
 #include "E2eSupport.h"
 
-#include <QCoreApplication>
-#include <QDeadlineTimer>
 #include <QDir>
 #include <QFile>
 #include <QJsonDocument>
 #include <QJsonObject>
 #include <QRegularExpression>
-#include <QTcpSocket>
-#include <QThread>
 
 #include <gmime/gmime.h>
 
@@ -65,14 +61,16 @@ user_pref("datareporting.policy.dataSubmissionEnabled", false);
 user_pref("toolkit.telemetry.reportingpolicy.firstRun", false);
 )";
 
-HeadlessBrowser::HeadlessBrowser(Kind kind, const QString& url) {
+HeadlessBrowser::HeadlessBrowser(Kind kind, const QStringList& urls) {
     const QString dir = m_profile.path();
     if (kind == Kind::Chromium) {
         // Tests run as root in CI, where Chromium's sandbox cannot start.
         m_process.start(QStringLiteral("chromium"),
-                        {QStringLiteral("--headless=new"), QStringLiteral("--no-sandbox"),
-                         QStringLiteral("--remote-debugging-port=0"),
-                         QStringLiteral("--user-data-dir=") + dir, url});
+                        QStringList{QStringLiteral("--headless=new"),
+                                    QStringLiteral("--no-sandbox"),
+                                    QStringLiteral("--remote-debugging-port=0"),
+                                    QStringLiteral("--user-data-dir=") + dir} +
+                            urls);
         m_process.waitForStarted();
         return;
     }
@@ -80,8 +78,9 @@ HeadlessBrowser::HeadlessBrowser(Kind kind, const QString& url) {
     if (prefs.open(QIODevice::WriteOnly))
         prefs.write(kFirefoxPrefs);
     m_process.start(QStringLiteral("firefox-esr"),
-                    {QStringLiteral("--headless"), QStringLiteral("--no-remote"),
-                     QStringLiteral("--profile"), dir, url});
+                    QStringList{QStringLiteral("--headless"), QStringLiteral("--no-remote"),
+                                QStringLiteral("--profile"), dir} +
+                        urls);
     m_process.waitForStarted();
 }
 
@@ -92,42 +91,15 @@ HeadlessBrowser::~HeadlessBrowser() {
     m_process.waitForFinished();
 }
 
-QByteArray HeadlessBrowser::devTools(const QByteArray& method, const QString& path) {
-    QFile file(m_profile.filePath(QStringLiteral("DevToolsActivePort")));
-    if (!file.open(QIODevice::ReadOnly))
-        return {};
-    QTcpSocket socket;
-    socket.connectToHost(QStringLiteral("127.0.0.1"), file.readLine().trimmed().toUShort());
-    socket.write(method + ' ' + path.toUtf8() +
-                 " HTTP/1.1\r\nHost: 127.0.0.1\r\nConnection: close\r\n\r\n");
-    // Chromium keeps the connection open: the body ends after Content-Length bytes.
-    QByteArray reply;
-    qsizetype end = -1;
-    while (end < 0 || reply.size() < end) {
-        if (!socket.waitForReadyRead(5000))
-            return {};
-        reply += socket.readAll();
-        const qsizetype body = reply.indexOf("\r\n\r\n") + 4;
-        const qsizetype length = reply.indexOf("Content-Length:");
-        if (body > 3 && length >= 0)
-            end = body + reply.mid(length + 15, body - length - 15)
-                             .split('\r')
-                             .first()
-                             .trimmed()
-                             .toLongLong();
-    }
-    return reply.mid(reply.indexOf("\r\n\r\n") + 4);
-}
-
-bool eventually(const std::function<bool()>& done, int seconds) {
-    QDeadlineTimer deadline(seconds * 1000);
-    while (!done()) {
-        if (deadline.hasExpired())
-            return false;
-        QCoreApplication::processEvents(QEventLoop::AllEvents, 100);
-        QThread::msleep(100);
-    }
-    return true;
+void HeadlessBrowser::openTab(const QString& url) {
+    QFile port(m_profile.filePath(QStringLiteral("DevToolsActivePort")));
+    if (port.open(QIODevice::ReadOnly))
+        QProcess::execute(QStringLiteral(PELMO_PYTHON3),
+                          {QStringLiteral("-c"),
+                           QStringLiteral("import sys, urllib.request as u; u.urlopen(u.Request("
+                                          "sys.argv[1], method='PUT'))"),
+                           QStringLiteral("http://127.0.0.1:%1/json/new?%2")
+                               .arg(QString::fromLatin1(port.readLine().trimmed()), url)});
 }
 
 PelmoRun runPelmo(const QStringList& arguments, const QProcessEnvironment& environment) {

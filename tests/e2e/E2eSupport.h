@@ -9,8 +9,6 @@
 #include <QStringList>
 #include <QTemporaryDir>
 
-#include <functional>
-
 /** A server script started with python3; it prints "PORT n" once listening. */
 class ServerProcess {
 public:
@@ -34,26 +32,24 @@ struct Certificates {
 };
 
 /**
- * A headless browser of Debian's on a profile of its own, showing url; ended by its own PID when
- * destroyed. Chromium opens its DevTools endpoint on a port it chooses.
+ * A headless browser of Debian's on a profile of its own, showing urls in tabs (Firefox selects the
+ * first); ended by its own PID when destroyed. Chromium opens its DevTools endpoint on a port it
+ * chooses.
  */
 class HeadlessBrowser {
 public:
     enum class Kind { Chromium, FirefoxEsr };
-    HeadlessBrowser(Kind kind, const QString& url);
+    HeadlessBrowser(Kind kind, const QStringList& urls);
     ~HeadlessBrowser();
     qint64 pid() const { return m_process.processId(); }
     QString profile() const { return m_profile.path(); }
-    /** Chromium: an HTTP request to the DevTools endpoint; its body, empty on failure. */
-    QByteArray devTools(const QByteArray& method, const QString& path);
+    /** Chromium: opens url in a new tab, which comes to the front. */
+    void openTab(const QString& url);
 
 private:
     QTemporaryDir m_profile;
     QProcess m_process;
 };
-
-/** Polls done (with the event loop running) until it holds or seconds pass. */
-bool eventually(const std::function<bool()>& done, int seconds = 15);
 
 struct PelmoRun {
     int status = -1;
