@@ -76,17 +76,19 @@ void FrontPageQuery::ask(Answer& answer) {
     }
     answer.pending = true;
     auto* download = new PageDownload(this);
-    connect(download, &PageDownload::finished, this,
-            [this, &answer, download, name](const QString& text, const QString& error) {
-                download->deleteLater();
-                answer.pending = false;
-                QString why = error;
-                if (!text.isNull())
-                    answer.page = ChromiumDevTools::frontPage(text.toUtf8(), &why);
-                if (!answer.page)
-                    answer.why = name + QStringLiteral(": ") + why;
-                answered();
-            });
+    connect(
+        download, &PageDownload::finished, this,
+        [this, &answer, download, name, port](const QString& text, const QString& error) {
+            download->deleteLater();
+            answer.pending = false;
+            QString why =
+                QStringLiteral("no answer from DevTools on 127.0.0.1:%1 (%2)").arg(port).arg(error);
+            if (!text.isNull())
+                answer.page = ChromiumDevTools::frontPage(text.toUtf8(), &why);
+            if (!answer.page)
+                answer.why = name + QStringLiteral(": ") + why;
+            answered();
+        });
     download->start(QStringLiteral("http://127.0.0.1:%1/json/list").arg(port), m_places.timeout);
 }
 
