@@ -1,30 +1,19 @@
 #include "app/Commands.h"
 #include "app/WindowMode.h"
-#include "util/AppIdentity.h"
 
-#include <QApplication>
+#include <QCoreApplication>
 #include <QGuiApplication>
 
 #include <cstring>
 #include <memory>
 
-namespace {
-
-void nameApplication() {
-    QCoreApplication::setOrganizationName(QString::fromLatin1(kOrganisationName));
-    QCoreApplication::setApplicationName(QString::fromLatin1(kApplicationName));
-    QCoreApplication::setApplicationVersion(QStringLiteral(PELMO_VERSION));
-}
-
-} // namespace
+#include <strings.h>
 
 int main(int argc, char** argv) {
-    if (argc <= 1) {
-        QApplication app(argc, argv);
-        nameApplication();
-        QGuiApplication::setDesktopFileName(QStringLiteral("pelmo"));
-        return runWindow();
-    }
+    // A link (any letter case, so that the controller can refuse one it does not take) opens
+    // the window as no argument does.
+    if (argc <= 1 || strncasecmp(argv[1], "mailto:", 7) == 0)
+        return startWindow(argc, argv, argc > 1 ? QString::fromLocal8Bit(argv[1]) : QString());
     // A mailing run lays its message body out with Qt's GUI text classes; on the offscreen
     // platform that needs no display, so it runs from cron and ssh too. The other commands
     // need no GUI at all.

@@ -138,6 +138,12 @@ void PelmoController::webPage() {
     frontPageQuery->start();
 }
 
+void PelmoController::handleGetURLEvent(const QString& url) {
+    static const QLatin1String scheme("mailto:");
+    if (url.startsWith(scheme))
+        window.setTo(url.mid(scheme.size()));
+}
+
 void PelmoController::setFrontPagePlaces(const FrontPageQuery::Places& places) {
     frontPagePlaces = places;
 }

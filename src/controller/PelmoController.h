@@ -96,6 +96,13 @@ public:
      * question is under way is ignored.
      */
     void webPage();
+    /**
+     * A link handed to Pelmo (a click on a mailto: link anywhere on the desktop): a link that
+     * begins with "mailto:", in exactly those letters, puts all that follows, query included
+     * and nothing decoded, in the To field; any other is ignored. A pending group selection
+     * stays, as only the user's typing drops it.
+     */
+    void handleGetURLEvent(const QString& url);
     /** Replaces where the browsers are looked for (tests hand in their own). */
     void setFrontPagePlaces(const FrontPageQuery::Places& places);
 
