@@ -49,6 +49,28 @@ TEST_F(HandOver, LinksFillTheRunningWindowsToField) {
     EXPECT_EQ(pelmo->getPeople()->size(), 2);
 }
 
+// Installed into a prefix of its own and made the default through its own command, Pelmo takes
+// the links xdg-open hands out.
+TEST_F(HandOver, XdgOpenReachesTheDefaultClient) {
+    const QString prefix = runtime.filePath("prefix");
+    ASSERT_EQ(QProcess::execute("cmake", {"--install", PELMO_BUILD_DIR, "--prefix", prefix}), 0);
+    qputenv("XDG_DATA_DIRS", (prefix + "/share").toUtf8());
+    qputenv("PATH", prefix.toUtf8() + "/bin:" + qgetenv("PATH"));
+    EXPECT_EQ(pelmoWith({"default-client", "--set"}), 0);
+    QProcess query;
+    query.start("xdg-mime", {"query", "default", "x-scheme-handler/mailto"});
+    query.waitForFinished();
+    EXPECT_EQ(query.readAllStandardOutput(), "pelmo.desktop\n");
+    SingleInstance instance;
+    ASSERT_TRUE(instance.listen());
+    acceptHandOvers(instance, *window, *pelmo);
+    QProcess open;
+    open.start("xdg-open", {"mailto:a@b.example?subject=x"});
+    EXPECT_TRUE(waitUntil([&] { return open.state() == QProcess::NotRunning; }, 15000));
+    EXPECT_EQ(open.exitCode(), 0) << open.readAllStandardError().toStdString();
+    EXPECT_EQ(child<QLineEdit>("to")->text(), "a@b.example?subject=x");
+}
+
 // Three starts at once, over the socket a crashed Pelmo left: one runs, two hand over.
 TEST_F(HandOver, OneOfThreeRacingStartsRuns) {
     ASSERT_EQ(QProcess::execute(

@@ -114,6 +114,7 @@ QString profile(const QString& input) {
                         ? QFile::link("127.0.0.1:" + files[i].section(':', 1),
                                       home.filePath(folder + "/lock"))
                         : file.open(QIODevice::WriteOnly) && file.write(recorded()) > 0 &&
+                              file.flush() &&
                               file.setFileTime(QDateTime::currentDateTime().addSecs(i * 60),
                                                QFileDevice::FileModificationTime));
     }
