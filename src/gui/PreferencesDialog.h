@@ -11,6 +11,7 @@ class QFormLayout;
 class QGroupBox;
 class QLabel;
 class QLineEdit;
+class QPushButton;
 class QSpinBox;
 
 /**
@@ -35,12 +36,18 @@ public:
     void save();
     void accept() override;
 
+Q_SIGNALS:
+    /** The user asked for links to e-mail addresses to open in Pelmo. */
+    void makeDefaultMailClientAsked();
+
 private:
     QGroupBox* createSender();
     QGroupBox* createRecipient();
     QGroupBox* createServer();
     QGroupBox* createMessage();
     QGroupBox* createCompletion();
+    QGroupBox* createMailLinks();
+    void showDefaultMailClient();
     QLineEdit* addText(QFormLayout* form, const char* label, MailSettings::Key key);
     QComboBox* addChoice(QFormLayout* form, const char* label, MailSettings::Key key,
                          const QList<const char*>& items);
@@ -56,5 +63,7 @@ private:
     QCheckBox* m_useSSL = nullptr;
     QLineEdit* m_password = nullptr;
     QLabel* m_passwordNote = nullptr;
+    QLabel* m_defaultClient = nullptr;
+    QPushButton* m_makeDefault = nullptr;
     QString m_loadedPassword;
 };
