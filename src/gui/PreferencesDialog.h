@@ -16,7 +16,8 @@ class QSpinBox;
 
 /**
  * The preferences: sender, default recipient, outgoing server with its login, message format
- * and what to do when a mailing completes, each kept under its settings key. The password goes
+ * and what to do when a mailing completes, each kept under its settings key; and which
+ * application opens links to e-mail addresses, with a button that asks for Pelmo. The password goes
  * to the system keyring when one answers, else to the settings file; the dialog
  * says which. Values are stored as typed: the controller checks them when it mails.
  *
