@@ -3,6 +3,8 @@
 #include "util/CLog.h"
 #include "util/PrivateFiles.h"
 
+#include <QDir>
+#include <QDirIterator>
 #include <QFile>
 #include <QFileInfo>
 #include <QSaveFile>
@@ -51,6 +53,31 @@ bool isInstalled(const QString& id, const QStringList& dataFolders) {
         }
     }
     return false;
+}
+
+// Without a default, links open in an installed application that says it takes them: the
+// first one in the folders' order, the user's folder first.
+QString anyMailClient(const QStringList& dataFolders) {
+    for (const QString& folder : dataFolders) {
+        const QString applications = folder + QLatin1String("/applications/");
+        QStringList paths;
+        for (QDirIterator it(applications, {QStringLiteral("*.desktop")}, QDir::Files,
+                             QDirIterator::Subdirectories);
+             it.hasNext();)
+            paths << it.next();
+        paths.sort();
+        for (const QString& path : std::as_const(paths)) {
+            QFile file(path);
+            if (!file.open(QIODevice::ReadOnly))
+                continue;
+            for (const QByteArray& line : file.readAll().split('\n')) {
+                if (keyOf(line) == "MimeType" &&
+                    line.mid(line.indexOf('=') + 1).trimmed().split(';').contains(kMailto))
+                    return path.mid(applications.size()).replace('/', '-');
+            }
+        }
+    }
+    return {};
 }
 
 // The file's text with Pelmo as the mailto default: the group's mailto line replaced, else one
@@ -116,7 +143,7 @@ QString DefaultMailClient() {
             }
         }
     }
-    return {};
+    return anyMailClient(data);
 }
 
 QString UserMimeAppsList() {
@@ -130,6 +157,8 @@ int MakePelmoDefaultMailClient() {
     errno = 0;
     if (!QFileInfo(folder).isDir() && !MakePrivateFolder(folder.toStdString()))
         return failed(path, errno);
+    if (QFileInfo(path).isDir()) // Qt refuses it without setting errno
+        return failed(path, EISDIR);
     QFile old(path);
     const bool existed = old.exists();
     if (existed && !old.open(QIODevice::ReadOnly))

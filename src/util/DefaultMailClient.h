@@ -10,7 +10,8 @@
  * order: in the user's config folder, then each system config folder, then the user's and the
  * systems' applications folders, a desktop's own "<desktop>-mimeapps.list" (for each name in
  * XDG_CURRENT_DESKTOP) before the plain "mimeapps.list". The first listed application whose
- * desktop file is installed wins.
+ * desktop file is installed wins. When none is listed, the first installed desktop file whose
+ * MimeType has x-scheme-handler/mailto does, as the desktop then opens links in it.
  */
 QString DefaultMailClient();
 
