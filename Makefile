@@ -3,10 +3,12 @@ BUILD_TEST ?= build/test
 BUILD_FUZZ ?= build/fuzz
 BUILD_BENCH ?= build/bench
 BUILD_RUN ?= build/run
+BUILD_RELEASE ?= build/release
+PREFIX ?= /usr/local
 JOBS ?= 2
 FUZZ_SECONDS ?= 60
 
-.PHONY: all deps run test bench fuzz mutants clean
+.PHONY: all deps run install test bench fuzz mutants clean
 
 all: test
 
@@ -18,6 +20,13 @@ run: deps
 	cmake -S . -B $(BUILD_RUN) -G Ninja -DCMAKE_BUILD_TYPE=Debug -DPELMO_BUILD_TESTS=OFF
 	cmake --build $(BUILD_RUN) -j $(JOBS) --target pelmo
 	$(BUILD_RUN)/src/pelmo
+
+# Builds Pelmo optimised and installs the program, its desktop entry and its icon under
+# $(PREFIX); DESTDIR=DIR stages them in DIR instead.
+install: deps
+	cmake -S . -B $(BUILD_RELEASE) -G Ninja -DCMAKE_BUILD_TYPE=Release -DPELMO_BUILD_TESTS=OFF
+	cmake --build $(BUILD_RELEASE) -j $(JOBS) --target pelmo
+	cmake --install $(BUILD_RELEASE) --prefix $(PREFIX)
 
 # The test build runs under AddressSanitizer and UndefinedBehaviorSanitizer.
 test: deps

@@ -13,6 +13,7 @@ packages=(
   python3-aiosmtpd openssl
   postfix
   libxcb1-dev xvfb
+  xdg-utils desktop-file-utils
 )
 
 missing=()

@@ -28,6 +28,8 @@ const std::vector<Command> kCommands = {
      "BASE-URL"},
     {"front-page", frontPage,
      "pelmo front-page                    print the address and title of the browser's page"},
+    {"default-client", defaultClient,
+     "pelmo default-client [--set]        print the mail client links open in, or make it Pelmo"},
 };
 
 } // namespace

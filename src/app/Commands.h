@@ -42,6 +42,13 @@ int send(const QStringList& args);
 int frontPage(const QStringList& args);
 
 /**
+ * `default-client`: prints the desktop id of the application that opens links to e-mail
+ * addresses (an empty line when none); 0 when it is Pelmo, else 1. `default-client --set` makes
+ * it Pelmo: 0, or 1 with the reason on standard error.
+ */
+int defaultClient(const QStringList& args);
+
+/**
  * Runs work on a controller over the console, with the user's address book, settings and
  * keyring and the activity log open; startUp first when asked (it prints "Ready."). A settings
  * failure is printed after "pelmo COMMAND: " and answers 1.

@@ -7,6 +7,7 @@
 #include "controller/SentRecipients.h"
 #include "smtp/SmtpClient.h"
 #include "util/CLog.h"
+#include "util/DefaultMailClient.h"
 #include "util/LocalizedStrings.h"
 
 #include <QCoreApplication>
@@ -116,6 +117,10 @@ void PelmoController::doAlert(const QString& title, const QString& informativeTe
 
 void PelmoController::openConsole() {
     OpenConsole();
+}
+
+void PelmoController::makePelmoDefaultEmailer() {
+    MakePelmoDefaultMailClient(); // a failure is in the log already
 }
 
 void PelmoController::reset() {

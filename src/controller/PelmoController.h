@@ -84,6 +84,8 @@ public:
     void doAlert(const QString& title, const QString& informativeText);
     /** Shows the activity log in the desktop's default application. */
     void openConsole();
+    /** Makes Pelmo open links to e-mail addresses; a failure is logged, never shown. */
+    void makePelmoDefaultEmailer();
     /** Clears the form for a new message: empty body and subject, default recipient. */
     void reset();
 

@@ -185,6 +185,10 @@ void MainWindow::createActions() {
     connect(attachments, &QAction::triggered, this, &MainWindow::showAttachments);
     auto* recipients = new QAction(LocalizedStringNS("Sent Recipients"), this);
     connect(recipients, &QAction::triggered, this, &MainWindow::showRecipientsWindow);
+    auto* makeDefault = new QAction(LocalizedStringNS("Make Pelmo the Default Mail Client"), this);
+    makeDefault->setObjectName(QStringLiteral("makeDefaultMailClientAction"));
+    connect(makeDefault, &QAction::triggered, m_controller,
+            &PelmoController::makePelmoDefaultEmailer);
     auto* quit = new QAction(LocalizedStringNS("Quit"), this);
     quit->setShortcut(QKeySequence::Quit);
     connect(quit, &QAction::triggered, qApp, &QApplication::quit);
@@ -197,6 +201,7 @@ void MainWindow::createActions() {
 
     QMenu* file = menuBar()->addMenu(LocalizedStringNS("&File"));
     file->addAction(preferences);
+    file->addAction(makeDefault);
     file->addSeparator();
     file->addAction(quit);
     QMenu* window = menuBar()->addMenu(LocalizedStringNS("&Window"));
@@ -331,8 +336,11 @@ void MainWindow::showAttachments() {
 }
 
 void MainWindow::showPreferences() {
-    if (!m_preferences)
+    if (!m_preferences) {
         m_preferences = new PreferencesDialog(m_passwords, m_settings, this);
+        connect(m_preferences, &PreferencesDialog::makeDefaultMailClientAsked, m_controller,
+                &PelmoController::makePelmoDefaultEmailer);
+    }
     m_preferences->load();
     m_preferences->open();
 }

@@ -1,6 +1,7 @@
 #include "gui/PreferencesDialog.h"
 
 #include "controller/PasswordStore.h"
+#include "util/DefaultMailClient.h"
 #include "util/LocalizedStrings.h"
 
 #include <QCheckBox>
@@ -49,6 +50,7 @@ PreferencesDialog::PreferencesDialog(PasswordStore& passwords, MailSettings& set
     left->addWidget(createRecipient());
     left->addWidget(createMessage());
     left->addWidget(createCompletion());
+    left->addWidget(createMailLinks());
     left->addStretch(1);
     auto* right = new QVBoxLayout;
     right->addWidget(createServer());
@@ -155,7 +157,36 @@ QGroupBox* PreferencesDialog::createCompletion() {
     return box;
 }
 
+QGroupBox* PreferencesDialog::createMailLinks() {
+    QFormLayout* form = nullptr;
+    QGroupBox* box = groupBox("Links to E-mail Addresses", form);
+    m_defaultClient = new QLabel;
+    m_defaultClient->setObjectName(QStringLiteral("defaultMailClient"));
+    m_defaultClient->setWordWrap(true);
+    form->addRow(m_defaultClient);
+    m_makeDefault = new QPushButton(LocalizedStringNS("Make Pelmo the Default Mail Client"));
+    m_makeDefault->setObjectName(QStringLiteral("makeDefaultMailClient"));
+    m_makeDefault->setAutoDefault(false);
+    connect(m_makeDefault, &QPushButton::clicked, this, [this] {
+        Q_EMIT makeDefaultMailClientAsked();
+        showDefaultMailClient();
+    });
+    form->addRow(m_makeDefault);
+    return box;
+}
+
+void PreferencesDialog::showDefaultMailClient() {
+    const QString client = DefaultMailClient();
+    const bool pelmo = client == QLatin1String("pelmo.desktop");
+    m_defaultClient->setText(
+        pelmo             ? LocalizedStringNS("Pelmo is your default mail client.")
+        : client.isNull() ? LocalizedStringNS("No application handles links to e-mail addresses.")
+                          : LocalizedStringNS("Links to e-mail addresses open in %1.").arg(client));
+    m_makeDefault->setEnabled(!pelmo);
+}
+
 void PreferencesDialog::load() {
+    showDefaultMailClient();
     m_settings.sync();
     for (QLineEdit* edit : std::as_const(m_texts))
         edit->setText(m_settings.string(keyOf(edit)));

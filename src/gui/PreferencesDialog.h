@@ -11,11 +11,13 @@ class QFormLayout;
 class QGroupBox;
 class QLabel;
 class QLineEdit;
+class QPushButton;
 class QSpinBox;
 
 /**
  * The preferences: sender, default recipient, outgoing server with its login, message format
- * and what to do when a mailing completes, each kept under its settings key. The password goes
+ * and what to do when a mailing completes, each kept under its settings key; and which
+ * application opens links to e-mail addresses, with a button that asks for Pelmo. The password goes
  * to the system keyring when one answers, else to the settings file; the dialog
  * says which. Values are stored as typed: the controller checks them when it mails.
  *
@@ -35,12 +37,18 @@ public:
     void save();
     void accept() override;
 
+Q_SIGNALS:
+    /** The user asked for links to e-mail addresses to open in Pelmo. */
+    void makeDefaultMailClientAsked();
+
 private:
     QGroupBox* createSender();
     QGroupBox* createRecipient();
     QGroupBox* createServer();
     QGroupBox* createMessage();
     QGroupBox* createCompletion();
+    QGroupBox* createMailLinks();
+    void showDefaultMailClient();
     QLineEdit* addText(QFormLayout* form, const char* label, MailSettings::Key key);
     QComboBox* addChoice(QFormLayout* form, const char* label, MailSettings::Key key,
                          const QList<const char*>& items);
@@ -56,5 +64,7 @@ private:
     QCheckBox* m_useSSL = nullptr;
     QLineEdit* m_password = nullptr;
     QLabel* m_passwordNote = nullptr;
+    QLabel* m_defaultClient = nullptr;
+    QPushButton* m_makeDefault = nullptr;
     QString m_loadedPassword;
 };

@@ -8,6 +8,8 @@
 
 #include <memory>
 
+#include <sys/stat.h>
+
 namespace {
 
 QByteArray bytes(const QString& path) {
@@ -68,6 +70,13 @@ public:
         } else if (what == "eml") {
             for (const QString& name : QDir(words[2]).entryList(QDir::Files, QDir::Name))
                 out += name + '\n' + outline(bytes(words[2] + '/' + name)) + '\n';
+        } else if (what == "cat") {
+            out = QString::fromUtf8(bytes(words[2]));
+        } else if (what == "mode") {
+            struct stat status {};
+            out = ::stat(QFile::encodeName(words[2]).constData(), &status) == 0
+                      ? QString::number(status.st_mode & 07777, 8)
+                      : QStringLiteral("(no file)");
         } else if (what == "log") {
             out = QString::fromUtf8(bytes(home.filePath("data/Orvale Software/Pelmo/Pelmo.log")));
             EXPECT_FALSE(out.contains('\n')) << "log lines end in a carriage return";

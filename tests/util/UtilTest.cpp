@@ -1,6 +1,7 @@
 #include "RowName.h"
 #include "util/CLog.h"
 #include "util/DataFolder.h"
+#include "util/DefaultMailClient.h"
 #include "util/LocalizedStrings.h"
 #include "util/PrivateFiles.h"
 #include "util/TextUtilities.h"
@@ -10,6 +11,7 @@
 #include <QCoreApplication>
 #include <QDateTime>
 #include <QDesktopServices>
+#include <QDir>
 #include <QFile>
 #include <QProcess>
 #include <QRegularExpression>
@@ -19,6 +21,7 @@
 #include <QUrl>
 #include <gtest/gtest.h>
 
+#include <map>
 #include <memory>
 
 #include <sys/stat.h>
@@ -43,6 +46,17 @@ std::vector<Row> rows(const char* file) {
         if (!line.isEmpty() && !line.startsWith('#'))
             lines.push_back({line.left(line.indexOf(' ')).toStdString(), line.toStdString()});
     return lines;
+}
+
+// The cases of a file of tests/data/util/, each its lines after the "== NAME" that starts it.
+std::vector<Row> cases(const char* file) {
+    QFile data(QStringLiteral(PELMO_TEST_DATA "/util/") + QLatin1String(file));
+    EXPECT_TRUE(data.open(QIODevice::ReadOnly));
+    std::vector<Row> all;
+    for (const QString& text : QString::fromUtf8(data.readAll()).split("\n== ").mid(1))
+        all.push_back(
+            {text.section('\n', 0, 0).toStdString(), text.section('\n', 1).toStdString()});
+    return all;
 }
 
 // The only entry a translator into French has.
@@ -252,6 +266,69 @@ TEST_P(Modes, Private) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Files, Modes, ::testing::ValuesIn(rows("privacy.txt")), RowName());
+
+// Catches a wrong lookup order or file name, and a reading of the files that xdg-mime does not
+// share; a line, group or comment lost, a mailto line added twice or to the wrong group; the
+// user's file made readable to others (no umask hides it here).
+class MimeApps : public ::testing::TestWithParam<Row> {
+protected:
+    void TearDown() override { ::umask(mask); }
+    void expectDefault(const std::string& expected, bool xdgMime) {
+        const QString client = DefaultMailClient();
+        EXPECT_EQ(client.isNull() ? "-" : client.toStdString(), expected);
+        if (!xdgMime)
+            return;
+        QProcess query;
+        query.start("xdg-mime", {"query", "default", "x-scheme-handler/mailto"});
+        ASSERT_TRUE(query.waitForFinished());
+        const std::string answer = query.readAllStandardOutput().trimmed().toStdString();
+        EXPECT_EQ(answer.empty() ? "-" : answer, expected) << "xdg-mime's answer";
+    }
+    mode_t mask = ::umask(0);
+    QTemporaryDir root;
+};
+
+TEST_P(MimeApps, MakePelmoDefault) {
+    std::map<QString, QString> given, expected;
+    std::map<QString, std::string> says;
+    QString* text = nullptr;
+    for (const QString& line : QString::fromStdString(GetParam().line).split('\n')) {
+        const QString word = line.section(' ', 0, 0), rest = line.section(' ', 1);
+        if (word == "<" || word == ">")
+            text = &(word == "<" ? given : expected)[rest];
+        else if (line.startsWith('|'))
+            *text += line.mid(1) + '\n';
+        for (const QString& app : word == "apps" ? rest.split(' ') : QStringList())
+            given["share/applications/" + app] =
+                "[Desktop Entry]\nType=Application\nName=M\nExec=sh\n";
+        says[word] = rest.toStdString();
+    }
+    for (const QString pair : {"XDG_CONFIG_HOME=config", "XDG_CONFIG_DIRS=etc",
+                               "XDG_DATA_HOME=data", "XDG_DATA_DIRS=share"})
+        qputenv(pair.section('=', 0, 0).toUtf8(), root.filePath(pair.section('=', 1)).toUtf8());
+    qputenv("XDG_CURRENT_DESKTOP", says["desktop"].c_str());
+    for (const auto& [path, content] : given) {
+        QFile file(root.filePath(path));
+        ASSERT_TRUE(QDir().mkpath(QFileInfo(file).path()) && file.open(QIODevice::WriteOnly));
+        file.write(content.toUtf8());
+    }
+    const QString list = root.filePath("config/mimeapps.list");
+    const QFile::Permissions mine =
+        QFile::ReadOwner | QFile::WriteOwner | QFile::ReadUser | QFile::WriteUser;
+    const int mode =
+        (QFile::exists(list) ? QFile::permissions(list) : mine).toInt(); // kept, or 0600
+    expectDefault(says["before"], says.count("xdg-mime"));
+    EXPECT_EQ(MakePelmoDefaultMailClient(), 0);
+    for (const auto& [path, content] : expected) {
+        QFile file(root.filePath(path));
+        EXPECT_TRUE(file.open(QIODevice::ReadOnly));
+        EXPECT_EQ(file.readAll().toStdString(), content.toStdString()) << path.toStdString();
+    }
+    EXPECT_EQ(QFile::permissions(list).toInt(), mode);
+    expectDefault(says["after"], says.count("xdg-mime"));
+}
+
+INSTANTIATE_TEST_SUITE_P(Util, MimeApps, ::testing::ValuesIn(cases("mimeapps.txt")), RowName());
 
 } // namespace
 
