@@ -181,7 +181,8 @@ void PreferencesDialog::showDefaultMailClient() {
     m_defaultClient->setText(
         pelmo             ? LocalizedStringNS("Pelmo is your default mail client.")
         : client.isNull() ? LocalizedStringNS("No application handles links to e-mail addresses.")
-                          : LocalizedStringNS("Links to e-mail addresses open in %1.").arg(client));
+                          : LocalizedStringNS("Links to e-mail addresses open in %1.")
+                                .arg(ApplicationName(client)));
     m_makeDefault->setEnabled(!pelmo);
 }
 

@@ -40,19 +40,23 @@ QList<QByteArray> mailtoDefaultsIn(const QString& path) {
 
 // A desktop id names a file of an applications folder, or of a folder in it: "kde4-kmail.desktop"
 // may be applications/kde4/kmail.desktop.
-bool isInstalled(const QString& id, const QStringList& dataFolders) {
+QString desktopFile(const QString& id, const QStringList& dataFolders) {
     if (id.isEmpty() || id.contains('/') || !id.endsWith(QLatin1String(".desktop")))
-        return false;
+        return {};
     QStringList paths = {id};
     for (qsizetype dash = id.indexOf('-'); dash >= 0; dash = id.indexOf('-', dash + 1))
         paths << QString(id).replace(dash, 1, '/');
     for (const QString& folder : dataFolders) {
         for (const QString& path : paths) {
             if (QFileInfo(folder + QLatin1String("/applications/") + path).isFile())
-                return true;
+                return folder + QLatin1String("/applications/") + path;
         }
     }
-    return false;
+    return {};
+}
+
+bool isInstalled(const QString& id, const QStringList& dataFolders) {
+    return !desktopFile(id, dataFolders).isEmpty();
 }
 
 // Without a default, links open in an installed application that says it takes them: the
@@ -144,6 +148,22 @@ QString DefaultMailClient() {
         }
     }
     return anyMailClient(data);
+}
+
+QString ApplicationName(const QString& id) {
+    QFile file(
+        desktopFile(id, QStandardPaths::standardLocations(QStandardPaths::GenericDataLocation)));
+    if (!file.open(QIODevice::ReadOnly))
+        return id;
+    bool inEntry = false;
+    for (const QByteArray& raw : file.readAll().split('\n')) {
+        const QByteArray line = raw.trimmed();
+        if (line.startsWith('['))
+            inEntry = line == "[Desktop Entry]";
+        else if (inEntry && line.contains('=') && keyOf(line) == "Name")
+            return QString::fromUtf8(line.mid(line.indexOf('=') + 1).trimmed());
+    }
+    return id;
 }
 
 QString UserMimeAppsList() {

@@ -15,6 +15,9 @@
  */
 QString DefaultMailClient();
 
+/** The Name of the installed desktop file id ("Thunderbird"), else id itself. */
+QString ApplicationName(const QString& id);
+
 /** The user's mimeapps.list, in the folder QStandardPaths::GenericConfigLocation names. */
 QString UserMimeAppsList();
 

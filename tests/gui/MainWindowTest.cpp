@@ -168,6 +168,26 @@ TEST_F(GuiFixture, PreferencesShowWhatIsStoredAndOkStoresWhatIsEntered) {
     dialog->reject(); // stores nothing
     EXPECT_EQ(stored("senderName"), "You");
 
+    // The row names the application that takes mailto: links; its button makes it Pelmo.
+    const QString apps = qEnvironmentVariable("XDG_DATA_HOME") + "/applications/";
+    QDir().mkpath(apps);
+    for (const char* name : {"Thunderbird", "Pelmo"}) {
+        QFile entry(apps + QString(name).toLower() + ".desktop");
+        ASSERT_TRUE(entry.open(QIODevice::WriteOnly));
+        entry.write("[Desktop Entry]\nName=" + QByteArray(name) +
+                    "\nMimeType=x-scheme-handler/mailto;\n");
+    }
+    QFile list(qEnvironmentVariable("XDG_CONFIG_HOME") + "/mimeapps.list");
+    ASSERT_TRUE(
+        list.open(QIODevice::WriteOnly) &&
+        list.write("[Default Applications]\nx-scheme-handler/mailto=thunderbird.desktop\n"));
+    list.close();
+    auto* row = child<QLabel>("defaultMailClient", open());
+    EXPECT_EQ(row->text(), "Links to e-mail addresses open in Thunderbird.");
+    QTest::mouseClick(child<QPushButton>("makeDefaultMailClient", row->window()), Qt::LeftButton);
+    EXPECT_EQ(row->text(), "Pelmo is your default mail client.");
+    dialog->reject();
+
     // The password goes to the keyring when one answers, leaving no copy in the settings file,
     // and to the settings file otherwise; the note tells which.
     const QString file = "the settings file " + settings().fileName() + ".";
