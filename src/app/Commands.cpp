@@ -35,8 +35,12 @@ const std::vector<Command> kCommands = {
 } // namespace
 
 QString usage() {
-    QString text = QStringLiteral("usage:\n"
-                                  "  pelmo                               open the window\n");
+    QString text =
+        QStringLiteral("usage:\n"
+                       "  pelmo                               open the window, or bring "
+                       "it to the front\n"
+                       "  pelmo mailto:ADDRESS                the same, ADDRESS in its To "
+                       "field\n");
     for (const Command& command : kCommands)
         text += QStringLiteral("  ") + QString::fromUtf8(command.synopsis) + QLatin1Char('\n');
     return text +
