@@ -1,0 +1,71 @@
+#pragma once
+
+#include <QObject>
+#include <QString>
+
+#include <chrono>
+
+/**
+ * Tells the user when a newer Pelmo has been published, and downloads it. The version document
+ * is an XML property list (a "Pelmo" dictionary with "CurrentVersion", a number, and
+ * "CurrentVersionString"); versions compare as plain numbers, the dots removed. The automatic
+ * check, 5 seconds after awake() when "checkForSoftwareUpdates" is on (absent: on), says
+ * nothing unless a newer version is published; the manual check reports in status lines; the
+ * download goes to the desktop folder under a name no file has yet. Everything runs on the main
+ * loop without blocking it; a check and a download may run side by side.
+ *
+ * The addresses are compiled in and may be replaced by the settings "softwareUpdateVersionURL"
+ * and "softwareUpdateDownloadURL" (the application's QSettings). Main thread only.
+ */
+class SoftwareUpdateController : public QObject {
+    Q_OBJECT
+
+public:
+    explicit SoftwareUpdateController(QObject* parent = nullptr);
+    ~SoftwareUpdateController() override;
+
+    /** The application's own version ("0.1.0"), the CMake project version. */
+    static QString getOurVersionString();
+    /**
+     * A version as a number: the dots removed, then the leading decimal digits ("1.2.3" is 123,
+     * "2.0" is 20, "1.2b4" is 12, "" is 0); at most 255 bytes of the text are read.
+     */
+    static int getVersionNumber(const QString& version);
+
+    /** Whether the automatic check is on: the stored setting, absent = on. */
+    bool checkForSoftwareUpdates() const;
+    /** Start-up: arms the one-shot automatic check 5 seconds later when it is on. */
+    void awake();
+    /** The automatic check: silent on every failure; updateAvailable() when newer. */
+    void checkForSoftwareUpdate();
+    /** The manual check (the window's Check button): its steps in statusChanged(). */
+    void checkVersion();
+    /** The window's Download button. */
+    void clickSoftwareUpdateButton();
+
+    bool checkInProgress() const { return m_softwareUpdateCheckInProgress; }
+    bool downloadInProgress() const { return m_softwareDownloadInProgress; }
+    /** Replaces the check's 10 s and the download's 20 s time-outs (tests). */
+    void setTimeouts(std::chrono::milliseconds check, std::chrono::milliseconds download);
+
+Q_SIGNALS:
+    /** The automatic check found a newer version: the alert's message and informative text. */
+    void updateAvailable(const QString& message, const QString& informativeText);
+    /** The window's status line (every text also goes to the activity log when it says so). */
+    void statusChanged(const QString& text);
+    /** The published version string, once a manual check has read it. */
+    void currentVersionChanged(const QString& version);
+    /** The manual check started (true) or ended (false): the spinner. */
+    void checkBusyChanged(bool busy);
+    /** The download indicator: shown or hidden, at percent (0 to 100). */
+    void downloadProgressChanged(bool visible, double percent);
+    /** A manual check or a download ended (for the command line and tests). */
+    void checkFinished(bool ok);
+    void downloadFinished(bool ok, const QString& path);
+
+private:
+    struct Private;
+    Private* d;
+    bool m_softwareUpdateCheckInProgress = false;
+    bool m_softwareDownloadInProgress = false;
+};
