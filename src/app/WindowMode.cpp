@@ -6,6 +6,7 @@
 #include "controller/PasswordStore.h"
 #include "controller/PelmoController.h"
 #include "gui/MainWindow.h"
+#include "update/SoftwareUpdateController.h"
 #include "util/AppIdentity.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
@@ -53,7 +54,10 @@ int runWindow(const QString& link, SingleInstance& instance) {
     controller.applicationWillFinishLaunching();
     controller.handleGetURLEvent(link);
     acceptHandOvers(instance, *window, controller);
+    SoftwareUpdateController updates;
+    window->setSoftwareUpdate(updates);
     window->show();
+    updates.awake();
     QObject::connect(qApp, &QCoreApplication::aboutToQuit, &controller,
                      &PelmoController::applicationWillTerminate);
     const int status = QApplication::exec();

@@ -63,6 +63,8 @@ const Row kTable[] = {
     {Key::SmtpTimeout, "smtpTimeout", 0, nullptr, nullptr},
     // Implicit TLS on a port other than 465.
     {Key::ImplicitTLS, "implicitTLS", false, nullptr, nullptr},
+    // Read by the software update check too, which sits below this table.
+    {Key::CheckForSoftwareUpdates, "checkForSoftwareUpdates", true, nullptr, nullptr},
 };
 
 const Row& rowOf(Key key) {

@@ -36,6 +36,7 @@ public:
         LoginPassword,
         SmtpTimeout,
         ImplicitTLS,
+        CheckForSoftwareUpdates,
     };
 
     /** The store of the current user; makes its folder and file private. */

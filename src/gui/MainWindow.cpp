@@ -8,6 +8,8 @@
 #include "gui/PeoplePicker.h"
 #include "gui/PreferencesDialog.h"
 #include "gui/RecipientsWindow.h"
+#include "gui/SoftwareUpdateWindow.h"
+#include "update/SoftwareUpdateController.h"
 #include "util/LocalizedStrings.h"
 
 #include <QAction>
@@ -199,13 +201,30 @@ void MainWindow::createActions() {
     tools->setToolButtonStyle(Qt::ToolButtonTextBesideIcon);
     tools->addActions({preferences, addresses, attachments, console});
 
-    QMenu* file = menuBar()->addMenu(LocalizedStringNS("&File"));
-    file->addAction(preferences);
-    file->addAction(makeDefault);
-    file->addSeparator();
-    file->addAction(quit);
+    m_fileMenu = menuBar()->addMenu(LocalizedStringNS("&File"));
+    m_fileMenu->addAction(preferences);
+    m_fileMenu->addAction(makeDefault);
+    m_fileMenu->addSeparator();
+    m_fileMenu->addAction(quit);
+    m_quitAction = quit;
     QMenu* window = menuBar()->addMenu(LocalizedStringNS("&Window"));
     window->addActions({addresses, attachments, recipients, console});
+}
+
+void MainWindow::setSoftwareUpdate(SoftwareUpdateController& updates) {
+    auto* open = new QAction(LocalizedStringNS("Software Update…"), this);
+    open->setObjectName(QStringLiteral("softwareUpdateAction"));
+    connect(open, &QAction::triggered, this, [this, &updates] {
+        if (!m_softwareUpdateWindow)
+            m_softwareUpdateWindow = new SoftwareUpdateWindow(updates, this);
+        m_softwareUpdateWindow->show();
+        m_softwareUpdateWindow->raise();
+        m_softwareUpdateWindow->activateWindow();
+    });
+    m_fileMenu->insertAction(
+        m_fileMenu->actions().at(m_fileMenu->actions().indexOf(m_quitAction) - 1), open);
+    connect(&updates, &SoftwareUpdateController::updateAvailable, m_controller,
+            &PelmoController::doAlert);
 }
 
 void MainWindow::connectPicker() {

@@ -18,6 +18,9 @@ class QProgressBar;
 class QPushButton;
 class QTextEdit;
 class RecipientsWindow;
+class SoftwareUpdateController;
+class SoftwareUpdateWindow;
+class QMenu;
 
 /**
  * Pelmo's window: the message editor with its formatting tool bar, the Subject, recipient and
@@ -42,6 +45,11 @@ public:
 
     /** Connects the window to the controller whose view it is; once, before it is shown. */
     void setController(PelmoController& controller);
+    /**
+     * Adds Software Update… to the File menu, and shows the automatic check's news as an
+     * alert; once, after setController(). updates is not owned and must outlive the window.
+     */
+    void setSoftwareUpdate(SoftwareUpdateController& updates);
     PelmoController& controller() const { return *m_controller; }
     PeoplePicker& peoplePicker() const { return *m_picker; }
     RecipientsWindow& recipientsWindow() const { return *m_recipients; }
@@ -103,6 +111,9 @@ private:
     RecipientsWindow* m_recipients = nullptr;
     PreferencesDialog* m_preferences = nullptr;
     AttachmentsWindow* m_attachmentsWindow = nullptr;
+    SoftwareUpdateWindow* m_softwareUpdateWindow = nullptr;
+    QMenu* m_fileMenu = nullptr;
+    QAction* m_quitAction = nullptr;
     /** The progress indicator's state: a counting bar, or a busy one that may be animated. */
     bool m_busy = true;
     bool m_animating = false;

@@ -54,6 +54,7 @@ PreferencesDialog::PreferencesDialog(PasswordStore& passwords, MailSettings& set
     left->addStretch(1);
     auto* right = new QVBoxLayout;
     right->addWidget(createServer());
+    right->addWidget(createUpdates());
     right->addStretch(1);
     auto* columns = new QHBoxLayout;
     columns->addLayout(left, 1);
@@ -157,6 +158,15 @@ QGroupBox* PreferencesDialog::createCompletion() {
     return box;
 }
 
+QGroupBox* PreferencesDialog::createUpdates() {
+    QFormLayout* form = nullptr;
+    QGroupBox* box = groupBox("Software Update", form);
+    m_checkForUpdates = new QCheckBox(LocalizedStringNS("Check for software updates at start-up"));
+    nameAfter(m_checkForUpdates, Key::CheckForSoftwareUpdates);
+    form->addRow(m_checkForUpdates);
+    return box;
+}
+
 QGroupBox* PreferencesDialog::createMailLinks() {
     QFormLayout* form = nullptr;
     QGroupBox* box = groupBox("Links to E-mail Addresses", form);
@@ -199,6 +209,9 @@ void PreferencesDialog::load() {
                          ? m_settings.integer(Key::ServerPort)
                          : MailSettings::suggested(Key::ServerPort).toInt());
     m_useSSL->setChecked(m_settings.boolean(Key::UseSSL));
+    // Absent, the check is on.
+    m_checkForUpdates->setChecked(!m_settings.contains(Key::CheckForSoftwareUpdates) ||
+                                  m_settings.boolean(Key::CheckForSoftwareUpdates));
     loadPassword();
 }
 
@@ -227,6 +240,7 @@ void PreferencesDialog::save() {
     }
     m_settings.setValue(Key::ServerPort, m_port->value());
     m_settings.setValue(Key::UseSSL, m_useSSL->isChecked());
+    m_settings.setValue(Key::CheckForSoftwareUpdates, m_checkForUpdates->isChecked());
     if (m_password->text() != m_loadedPassword)
         savePassword();
 }

@@ -48,6 +48,7 @@ private:
     QGroupBox* createMessage();
     QGroupBox* createCompletion();
     QGroupBox* createMailLinks();
+    QGroupBox* createUpdates();
     void showDefaultMailClient();
     QLineEdit* addText(QFormLayout* form, const char* label, MailSettings::Key key);
     QComboBox* addChoice(QFormLayout* form, const char* label, MailSettings::Key key,
@@ -62,6 +63,7 @@ private:
     QList<QComboBox*> m_choices;
     QSpinBox* m_port = nullptr;
     QCheckBox* m_useSSL = nullptr;
+    QCheckBox* m_checkForUpdates = nullptr;
     QLineEdit* m_password = nullptr;
     QLabel* m_passwordNote = nullptr;
     QLabel* m_defaultClient = nullptr;
