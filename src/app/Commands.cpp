@@ -30,6 +30,8 @@ const std::vector<Command> kCommands = {
      "pelmo front-page                    print the address and title of the browser's page"},
     {"default-client", defaultClient,
      "pelmo default-client [--set]        print the mail client links open in, or make it Pelmo"},
+    {"check-update", checkUpdate,
+     "pelmo check-update                  ask whether a newer Pelmo has been published"},
 };
 
 } // namespace

@@ -49,6 +49,12 @@ int frontPage(const QStringList& args);
 int defaultClient(const QStringList& args);
 
 /**
+ * `check-update`: asks whether a newer Pelmo has been published, printing each step. 0 when the
+ * answer came (up to date, or an update exists), 1 when the check failed.
+ */
+int checkUpdate(const QStringList& args);
+
+/**
  * Runs work on a controller over the console, with the user's address book, settings and
  * keyring and the activity log open; startUp first when asked (it prints "Ready."). A settings
  * failure is printed after "pelmo COMMAND: " and answers 1.

@@ -1,9 +1,15 @@
 #pragma once
 
+#include <QFile>
+#include <QNetworkAccessManager>
 #include <QObject>
+#include <QPointer>
 #include <QString>
+#include <QUrl>
 
 #include <chrono>
+
+class QNetworkReply;
 
 /**
  * Tells the user when a newer Pelmo has been published, and downloads it. The version document
@@ -64,8 +70,25 @@ Q_SIGNALS:
     void downloadFinished(bool ok, const QString& path);
 
 private:
-    struct Private;
-    Private* d;
+    static QUrl settingOr(const char* key, const char* compiledIn);
+    QNetworkReply* get(const QUrl& url, std::chrono::milliseconds timeout);
+    void automaticCheckFinished(QNetworkReply* reply);
+    void manualCheckFinished(QNetworkReply* reply);
+    void status(const QString& text, bool logged);
+    bool allowRedirect(const QUrl& to);
+    bool createDestination();
+    void downloadReadyRead();
+    void downloadDone();
+    void downloadFailed(const QString& description);
+
+    QNetworkAccessManager m_network;
+    std::chrono::milliseconds m_checkTimeout{10000};
+    std::chrono::milliseconds m_downloadTimeout{20000};
+    QPointer<QNetworkReply> m_download;
+    QUrl m_downloadUrl;    // as first asked for: redirects stay on its host unless https
+    int m_redirects = 0;   // followed so far for this download
+    QFile m_file;          // open from the first byte of the body to the end
+    qint64 m_received = 0; // bytes of the body written so far
     bool m_softwareUpdateCheckInProgress = false;
     bool m_softwareDownloadInProgress = false;
 };
