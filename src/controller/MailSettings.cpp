@@ -84,7 +84,7 @@ std::filesystem::path pathOf(const QString& name) {
 
 MailSettings::MailSettings()
     : store(QString::fromLatin1(kOrganisationName), QString::fromLatin1(kApplicationName)) {
-    static_assert(std::size(kTable) == static_cast<size_t>(Key::ImplicitTLS) + 1);
+    static_assert(std::size(kTable) == static_cast<size_t>(Key::CheckForSoftwareUpdates) + 1);
     // The file may hold the password when no keyring answers: made private before anything is
     // written to it, and tightened when an older Pelmo left it readable.
     const QFileInfo file(store.fileName());

@@ -1,5 +1,7 @@
 #include "update/SoftwareUpdateController.h"
 
+#include "util/AppIdentity.h"
+
 #include "update/VersionDocument.h"
 #include "util/CLog.h"
 #include "util/LocalizedStrings.h"
@@ -109,14 +111,16 @@ int SoftwareUpdateController::getVersionNumber(const QString& version) {
 }
 
 QUrl SoftwareUpdateController::settingOr(const char* key, const char* compiledIn) {
-    QSettings settings;
+    QSettings settings(QString::fromLatin1(kOrganisationName),
+                       QString::fromLatin1(kApplicationName));
     settings.sync(); // another Pelmo may just have changed it
     const QVariant value = settings.value(QLatin1String(key));
     return QUrl(value.isValid() ? value.toString() : QString::fromUtf8(compiledIn));
 }
 
 bool SoftwareUpdateController::checkForSoftwareUpdates() const {
-    QSettings settings;
+    QSettings settings(QString::fromLatin1(kOrganisationName),
+                       QString::fromLatin1(kApplicationName));
     settings.sync();
     return settings.value(QStringLiteral("checkForSoftwareUpdates"), true).toBool();
 }

@@ -21,7 +21,8 @@ class QNetworkReply;
  * loop without blocking it; a check and a download may run side by side.
  *
  * The addresses are compiled in and may be replaced by the settings "softwareUpdateVersionURL"
- * and "softwareUpdateDownloadURL" (the application's QSettings). Main thread only.
+ * and "softwareUpdateDownloadURL" (the settings file Pelmo shares with its preferences). Main
+ * thread only.
  */
 class SoftwareUpdateController : public QObject {
     Q_OBJECT

@@ -3,6 +3,8 @@
 #include "e2e/E2eSupport.h"
 #include "gui/PreferencesDialog.h"
 #include "gui/RecipientsWindow.h"
+#include "gui/SoftwareUpdateWindow.h"
+#include "update/SoftwareUpdateController.h"
 
 #include <QLabel>
 #include <QMetaProperty>
@@ -83,6 +85,31 @@ TEST_F(WindowRun, SendMailsTheTypedRecipientThenAGroup) {
     EXPECT_EQ(shown(), "Send 1 of 3 / 1 ann@example.org");
     press(); // goes on with those not yet mailed
     EXPECT_EQ(shown(), "Send -1 of 1 / 1 ann@example.org 2 bob@example.org 3 cy@example.org");
+}
+
+// File ▸ Software Update… opens the window, whose Check Now shows what the site publishes; the
+// automatic check's news comes as the alert.
+TEST_F(GuiFixture, SoftwareUpdateWindowChecksAndTheStartUpCheckAlerts) {
+    ServerProcess site{PELMO_TEST_DIR "/controller/page_server.py",
+                       {PELMO_TEST_DIR "/data/update"}};
+    set("softwareUpdateVersionURL", QString("http://127.0.0.1:%1/newer.plist").arg(site.port()));
+    SoftwareUpdateController updates;
+    window->setSoftwareUpdate(updates);
+    child<QAction>("softwareUpdateAction")->trigger();
+    auto* updateWindow = window->findChild<SoftwareUpdateWindow*>();
+    ASSERT_TRUE(updateWindow && updateWindow->isVisible());
+    QTest::mouseClick(child<QPushButton>("checkVersionButton", updateWindow), Qt::LeftButton);
+    auto* status = child<QLabel>("softwareUpdateStatus", updateWindow);
+    EXPECT_TRUE(waitUntil([&] { return status->text() == "An update is available for Pelmo."; }))
+        << status->text().toStdString();
+    EXPECT_EQ(child<QLabel>("currentVersion", updateWindow)->text(), "0.1.1");
+    updates.checkForSoftwareUpdate();
+    ASSERT_TRUE(waitUntil([] { return asked<QMessageBox>() != nullptr; }));
+    EXPECT_EQ(asked<QMessageBox>()->text() + ' ' + asked<QMessageBox>()->informativeText(),
+              "An update is available for Pelmo (version 0.1.1.) Use Software Update in the Pelmo "
+              "menu to download it. (You can turn off automatic software update checks in "
+              "Preferences.)");
+    asked<QMessageBox>()->accept();
 }
 
 TEST_F(GuiFixture, BoldFormatsTheSelectionOrWhatIsTypedNext) {
