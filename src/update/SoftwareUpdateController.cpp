@@ -303,7 +303,10 @@ void SoftwareUpdateController::downloadReadyRead() {
         downloadFailed(m_file.errorString());
         return;
     }
+    // Called again when the reply ends, often with nothing left: no line for no bytes.
     const QByteArray chunk = m_download->readAll();
+    if (chunk.isEmpty())
+        return;
     if (m_file.write(chunk) != chunk.size()) {
         downloadFailed(m_file.errorString());
         return;
