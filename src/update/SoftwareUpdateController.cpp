@@ -61,9 +61,11 @@ QString desktopFolder() {
     return folder;
 }
 
-bool httpFailed(QNetworkReply* reply) {
+// An HTTP status outside `from`..299 is not the document asked for (RFC 9110 section 15): an
+// error page's body is not the update, nor is a redirect's or an interim response's.
+bool httpFailed(QNetworkReply* reply, int from = 100) {
     const QVariant code = reply->attribute(QNetworkRequest::HttpStatusCodeAttribute);
-    return code.isValid() && code.toInt() >= 400;
+    return code.isValid() && (code.toInt() < from || code.toInt() >= 300);
 }
 
 } // namespace
@@ -247,15 +249,19 @@ void SoftwareUpdateController::clickSoftwareUpdateButton() {
     QNetworkRequest request(m_downloadUrl);
     request.setAttribute(QNetworkRequest::RedirectPolicyAttribute,
                          QNetworkRequest::UserVerifiedRedirectPolicy);
-    request.setMaximumRedirectsAllowed(kMaxRedirects);
+    request.setMaximumRedirectsAllowed(kMaxRedirects + 1); // the last one refused by us
     request.setTransferTimeout(static_cast<int>(m_downloadTimeout.count()));
     m_download = m_network.get(request);
     QNetworkReply* reply = m_download;
     connect(reply, &QNetworkReply::redirected, this, [this, reply](const QUrl& to) {
-        if (allowRedirect(to))
-            Q_EMIT reply->redirectAllowed();
+        if (++m_redirects > kMaxRedirects)
+            downloadFailed(LocalizedStringNS("The download was redirected too many times."), to);
+        else if (!allowRedirect(to))
+            downloadFailed(
+                LocalizedStringNS("The download was redirected to another host without HTTPS."),
+                to);
         else
-            reply->abort();
+            Q_EMIT reply->redirectAllowed();
     });
     connect(reply, &QNetworkReply::readyRead, this, &SoftwareUpdateController::downloadReadyRead);
     connect(reply, &QNetworkReply::finished, this, &SoftwareUpdateController::downloadDone);
@@ -263,9 +269,8 @@ void SoftwareUpdateController::clickSoftwareUpdateButton() {
 
 // RFC 9110 section 15.4: a redirect is followed only to a secure address or on the host first
 // asked, so that no plain-text detour can hand over another file.
-bool SoftwareUpdateController::allowRedirect(const QUrl& to) {
-    return ++m_redirects <= kMaxRedirects &&
-           (to.scheme() == QLatin1String("https") || to.host() == m_downloadUrl.host());
+bool SoftwareUpdateController::allowRedirect(const QUrl& to) const {
+    return to.scheme() == QLatin1String("https") || to.host() == m_downloadUrl.host();
 }
 
 bool SoftwareUpdateController::createDestination() {
@@ -295,9 +300,7 @@ bool SoftwareUpdateController::createDestination() {
 }
 
 void SoftwareUpdateController::downloadReadyRead() {
-    // An error page's body is not the update.
-    if (!m_download || httpFailed(m_download) ||
-        m_download->attribute(QNetworkRequest::RedirectionTargetAttribute).isValid())
+    if (!m_download || httpFailed(m_download, 200))
         return;
     if (!m_file.isOpen() && !createDestination()) {
         downloadFailed(m_file.errorString());
@@ -331,8 +334,12 @@ void SoftwareUpdateController::downloadDone() {
     if (!m_download)
         return;
     m_download->deleteLater();
-    if (m_download->error() != QNetworkReply::NoError || httpFailed(m_download)) {
+    if (m_download->error() != QNetworkReply::NoError) {
         downloadFailed(m_download->errorString());
+        return;
+    }
+    if (httpFailed(m_download, 200)) {
+        downloadFailed(LocalizedStringNS("The server did not send the file."));
         return;
     }
     downloadReadyRead(); // an empty file, or what arrived with the end
@@ -359,16 +366,16 @@ void SoftwareUpdateController::downloadDone() {
     Q_EMIT downloadFinished(true, m_file.fileName());
 }
 
-void SoftwareUpdateController::downloadFailed(const QString& description) {
+void SoftwareUpdateController::downloadFailed(const QString& description, const QUrl& url) {
     QNetworkReply* reply = m_download;
     m_download = nullptr;
     reply->disconnect(this);
     reply->abort();
     reply->deleteLater();
-    LogEntry(
-        LocalizedFormat("Download failed! Error - %@ %@", {description, reply->url().toString()})
-            .toUtf8()
-            .constData());
+    LogEntry(LocalizedFormat("Download failed! Error - %@ %@",
+                             {description, (url.isEmpty() ? reply->url() : url).toString()})
+                 .toUtf8()
+                 .constData());
     // A half-downloaded package is of no use and looks like the real one: it goes.
     QString path;
     if (m_file.isOpen()) {

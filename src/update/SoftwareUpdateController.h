@@ -76,11 +76,12 @@ private:
     void automaticCheckFinished(QNetworkReply* reply);
     void manualCheckFinished(QNetworkReply* reply);
     void status(const QString& text, bool logged);
-    bool allowRedirect(const QUrl& to);
+    bool allowRedirect(const QUrl& to) const;
     bool createDestination();
     void downloadReadyRead();
     void downloadDone();
-    void downloadFailed(const QString& description);
+    /** Ends the download, its partial file removed; url: the failing one, when not the reply's. */
+    void downloadFailed(const QString& description, const QUrl& url = {});
 
     QNetworkAccessManager m_network;
     std::chrono::milliseconds m_checkTimeout{10000};

@@ -43,6 +43,12 @@ QString address(const QString& path) {
     return path.startsWith("http") ? path : base() + path;
 }
 
+// An expected text with the address asked, the server's port and the file downloaded.
+QString fill(QString text, const QString& url, const QString& file = {}) {
+    const QString port = QString::number(QUrl(base()).port());
+    return text.replace("{url}", url).replace("{port}", port).replace("{file}", file);
+}
+
 // Runs the event loop until every request has ended (its reply is deleted then).
 QString settle(SoftwareUpdateController& update, const QSignalSpy& statuses) {
     for (int i = 0; i < 250 && !update.findChildren<QNetworkReply*>().isEmpty(); ++i)
@@ -61,7 +67,7 @@ INSTANTIATE_TEST_SUITE_P(Update, Check, ::testing::ValuesIn(rows("checks.txt")),
 // printing other lines or answering the wrong exit status.
 TEST_P(Check, StatusLinesAndAlert) {
     const QString url = address(GetParam().field[0]);
-    const QString expected = QString(GetParam().text).replace("{url}", url);
+    const QString expected = fill(GetParam().text, url);
     QSettings().setValue("softwareUpdateVersionURL", url);
     SoftwareUpdateController update;
     update.setTimeouts(std::chrono::milliseconds(300), std::chrono::milliseconds(300));
@@ -101,10 +107,9 @@ TEST_P(Download, ToTheDesktop) {
     QSignalSpy progress(&update, &SoftwareUpdateController::downloadProgressChanged);
     QSignalSpy finished(&update, &SoftwareUpdateController::downloadFinished);
     update.clickSoftwareUpdateButton();
-    const QString lines = settle(update, statuses);
-    const QString path = desktop.filePath(field[2]), log = GetParam().text.section('\n', 0, 0);
-    EXPECT_TRUE(
-        QRegularExpression("^" + GetParam().text.section('\n', 1) + "$").match(lines).hasMatch())
+    const QString lines = settle(update, statuses), pattern = GetParam().text.section('\n', 1);
+    const QString path = field[2].isEmpty() ? "" : desktop.filePath(field[2]);
+    EXPECT_TRUE(QRegularExpression("^" + pattern + "$").match(lines).hasMatch())
         << lines.toStdString();
     EXPECT_EQ(finished, (Signals{{field[3] == "1", path}}));
     EXPECT_EQ(QFileInfo(path).size(), field[3] == "1" ? 65536 : 0);
@@ -112,25 +117,19 @@ TEST_P(Download, ToTheDesktop) {
     // Made by the download, the folder is the user's alone.
     EXPECT_TRUE(!field[1].isEmpty() || !(QFile::permissions(desktop.path()) & 0x0077));
     QFile file(QDir::homePath() + "/Orvale Software/Pelmo/Pelmo.log");
-    ASSERT_TRUE(file.open(QFile::ReadOnly));
-    const QByteArray written = file.readAll();
+    const QByteArray written = file.open(QFile::ReadOnly) ? file.readAll() : "";
     EXPECT_TRUE(written.contains(
-        QString(log).replace("{url}", address(field[0])).replace("{file}", path).toUtf8() + '\r'))
+        fill(GetParam().text.section('\n', 0, 0), address(field[0]), path).toUtf8() + '\r'))
         << written.toStdString();
 }
 
+class Version : public ::testing::TestWithParam<Row> {};
+INSTANTIATE_TEST_SUITE_P(Update, Version, ::testing::ValuesIn(rows("versions.txt")), RowName());
+
 // Catches: versions compared as text, dots kept, a text read past 255 bytes, an overflow.
-TEST(Update, VersionNumbers) {
-    const QList<QPair<QString, int>> table = {{"1.2.3", 123},
-                                              {"2.0", 20},
-                                              {"1.10", 110},
-                                              {"", 0},
-                                              {"1.2b4", 12},
-                                              {" -4.2", -42},
-                                              {QString(254, '.') + "12345", 1},
-                                              {"99999999999", INT_MAX}};
-    for (const auto& [text, number] : table)
-        EXPECT_EQ(SoftwareUpdateController::getVersionNumber(text), number) << text.toStdString();
+TEST_P(Version, AsNumber) {
+    EXPECT_EQ(SoftwareUpdateController::getVersionNumber(GetParam().field[0]),
+              GetParam().field[1].toInt());
 }
 
 // Catches: an automatic check armed though turned off, not 5 seconds later, or not checking.

@@ -6,6 +6,8 @@ on purpose on a few paths:
   /cut/NAME      announces NAME's length, sends half of it and closes the connection
   /nolength/NAME sends NAME without a Content-Length, ending it by closing the connection
   /named/NAME    sends NAME with a Content-Disposition that suggests "Pelmo-2.0.deb"
+  /moved/NAME    redirects to /NAME on the same host
+  /away/NAME     redirects to http://localhost:PORT/NAME, another host over plain HTTP
 
 Prints "PORT <n>" once listening, then "GET <path>" for each request; stops when its standard
 input closes, or after a minute so that a test that dies never leaves it behind.
@@ -20,6 +22,8 @@ import time
 
 
 class Handler(http.server.SimpleHTTPRequestHandler):
+    protocol_version = "HTTP/1.1"
+
     def log_message(self, *args):
         pass
 
@@ -37,6 +41,12 @@ class Handler(http.server.SimpleHTTPRequestHandler):
         self.wfile.flush()
         self.close_connection = True
 
+    def redirect(self, location):
+        self.send_response(302)
+        self.send_header("Location", location)
+        self.send_header("Content-Length", "0")
+        self.end_headers()
+
     def do_GET(self):
         print(f"GET {self.path}", flush=True)
         parts = self.path.split("/")
@@ -49,6 +59,10 @@ class Handler(http.server.SimpleHTTPRequestHandler):
             self.send_file(parts[2], length=False)
         elif parts[1] == "named":
             self.send_file(parts[2], disposition='attachment; filename="../Pelmo-2.0.deb"')
+        elif parts[1] == "moved":
+            self.redirect("/" + parts[2])
+        elif parts[1] == "away":
+            self.redirect(f"http://localhost:{self.server.server_address[1]}/{parts[2]}")
         else:
             super().do_GET()
 
