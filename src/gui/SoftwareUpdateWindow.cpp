@@ -49,8 +49,11 @@ SoftwareUpdateWindow::SoftwareUpdateWindow(SoftwareUpdateController& updates, QW
 
     connect(m_checkVersionButton, &QPushButton::clicked, &updates,
             &SoftwareUpdateController::checkVersion);
-    connect(m_softwareDownloadButton, &QPushButton::clicked, &updates,
-            &SoftwareUpdateController::clickSoftwareUpdateButton);
+    // One download at a time: the button waits for the one under way.
+    connect(m_softwareDownloadButton, &QPushButton::clicked, &updates, [this, &updates] {
+        m_softwareDownloadButton->setEnabled(false);
+        updates.clickSoftwareUpdateButton();
+    });
     connect(&updates, &SoftwareUpdateController::statusChanged, m_softwareUpdateField,
             &QLabel::setText);
     connect(&updates, &SoftwareUpdateController::currentVersionChanged, m_currentVersionField,
@@ -64,7 +67,8 @@ SoftwareUpdateWindow::SoftwareUpdateWindow(SoftwareUpdateController& updates, QW
             });
     // A download that cannot even start is told by a beep, as the log says why.
     connect(&updates, &SoftwareUpdateController::downloadFinished, this,
-            [](bool ok, const QString& path) {
+            [this](bool ok, const QString& path) {
+                m_softwareDownloadButton->setEnabled(true);
                 if (!ok && path.isEmpty())
                     QApplication::beep();
             });

@@ -185,8 +185,6 @@ void SoftwareUpdateController::status(const QString& text, bool logged) {
 }
 
 void SoftwareUpdateController::checkVersion() {
-    if (m_softwareUpdateCheckInProgress)
-        return;
     m_softwareUpdateCheckInProgress = true;
     status(LocalizedStringNS("Checking for a software update..."), false);
     Q_EMIT checkBusyChanged(true);

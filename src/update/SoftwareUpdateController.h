@@ -47,7 +47,7 @@ public:
     void checkForSoftwareUpdate();
     /** The manual check (the window's Check button): its steps in statusChanged(). */
     void checkVersion();
-    /** The window's Download button. */
+    /** The window's Download button; ignored while a download runs, which has one file. */
     void clickSoftwareUpdateButton();
 
     bool checkInProgress() const { return m_softwareUpdateCheckInProgress; }
