@@ -153,15 +153,21 @@ QNetworkReply* SoftwareUpdateController::get(const QUrl& url, std::chrono::milli
     return m_network.get(request);
 }
 
-void SoftwareUpdateController::checkForSoftwareUpdate() {
+bool SoftwareUpdateController::fetchVersion(
+    void (SoftwareUpdateController::*finished)(QNetworkReply*)) {
     const QUrl url = settingOr("softwareUpdateVersionURL", PELMO_UPDATE_VERSION_URL);
     if (!url.isValid() || url.isRelative())
-        return;
+        return false;
     QNetworkReply* reply = get(url, m_checkTimeout);
-    connect(reply, &QNetworkReply::finished, this, [this, reply] {
+    connect(reply, &QNetworkReply::finished, this, [this, reply, finished] {
         reply->deleteLater();
-        automaticCheckFinished(reply);
+        (this->*finished)(reply);
     });
+    return true;
+}
+
+void SoftwareUpdateController::checkForSoftwareUpdate() {
+    fetchVersion(&SoftwareUpdateController::automaticCheckFinished);
 }
 
 void SoftwareUpdateController::automaticCheckFinished(QNetworkReply* reply) {
@@ -188,20 +194,12 @@ void SoftwareUpdateController::checkVersion() {
     m_softwareUpdateCheckInProgress = true;
     status(LocalizedStringNS("Checking for a software update..."), false);
     Q_EMIT checkBusyChanged(true);
-    const QUrl url = settingOr("softwareUpdateVersionURL", PELMO_UPDATE_VERSION_URL);
-    if (!url.isValid() || url.isRelative()) {
-        status(LocalizedStringNS("Pelmo could not check for a software update at this time."),
-               false);
-        m_softwareUpdateCheckInProgress = false;
-        Q_EMIT checkBusyChanged(false);
-        Q_EMIT checkFinished(false);
+    if (fetchVersion(&SoftwareUpdateController::manualCheckFinished))
         return;
-    }
-    QNetworkReply* reply = get(url, m_checkTimeout);
-    connect(reply, &QNetworkReply::finished, this, [this, reply] {
-        reply->deleteLater();
-        manualCheckFinished(reply);
-    });
+    status(LocalizedStringNS("Pelmo could not check for a software update at this time."), false);
+    m_softwareUpdateCheckInProgress = false;
+    Q_EMIT checkBusyChanged(false);
+    Q_EMIT checkFinished(false);
 }
 
 void SoftwareUpdateController::manualCheckFinished(QNetworkReply* reply) {

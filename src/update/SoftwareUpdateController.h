@@ -73,6 +73,8 @@ Q_SIGNALS:
 private:
     static QUrl settingOr(const char* key, const char* compiledIn);
     QNetworkReply* get(const QUrl& url, std::chrono::milliseconds timeout);
+    /** Asks for the version document, finished taking the reply; false when it cannot ask. */
+    bool fetchVersion(void (SoftwareUpdateController::*finished)(QNetworkReply*));
     void automaticCheckFinished(QNetworkReply* reply);
     void manualCheckFinished(QNetworkReply* reply);
     void status(const QString& text, bool logged);
