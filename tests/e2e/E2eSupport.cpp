@@ -64,10 +64,12 @@ user_pref("toolkit.telemetry.reportingpolicy.firstRun", false);
 HeadlessBrowser::HeadlessBrowser(Kind kind, const QStringList& urls) {
     const QString dir = m_profile.path();
     if (kind == Kind::Chromium) {
-        // Tests run as root in CI, where Chromium's sandbox cannot start.
+        // Tests run as root in CI, where Chromium's sandbox cannot start, often in a container
+        // whose /dev/shm is small.
         m_process.start(QStringLiteral("chromium"),
                         QStringList{QStringLiteral("--headless=new"),
                                     QStringLiteral("--no-sandbox"),
+                                    QStringLiteral("--disable-dev-shm-usage"),
                                     QStringLiteral("--remote-debugging-port=0"),
                                     QStringLiteral("--user-data-dir=") + dir} +
                             urls);
