@@ -2,6 +2,8 @@
 
 #include <QString>
 
+#include <functional>
+
 class QMessageBox;
 class QWidget;
 
@@ -10,3 +12,10 @@ class QWidget;
  * that has sheets) and returns at once; the box deletes itself when closed.
  */
 QMessageBox* openAlert(QWidget* window, const QString& text, const QString& informativeText);
+
+/**
+ * Asks question on window, window-modal, and returns at once: the yes button (the action, as
+ * "Send Again") calls then; Cancel, the default button, and closing the box do nothing.
+ */
+void askThen(QWidget* window, const QString& question, const QString& yes,
+             const std::function<void()>& then);

@@ -11,6 +11,7 @@
 #include "gui/SoftwareUpdateWindow.h"
 #include "update/SoftwareUpdateController.h"
 #include "util/LocalizedStrings.h"
+#include "util/TextUtilities.h"
 
 #include <QAction>
 #include <QApplication>
@@ -70,7 +71,7 @@ void MainWindow::setController(PelmoController& controller) {
     reportEdits(m_to, PelmoView::Field::To);
     reportEdits(m_name, PelmoView::Field::Name);
     reportEdits(m_subject, PelmoView::Field::Subject);
-    connect(m_sendButton, &QPushButton::clicked, &controller, &PelmoController::send);
+    connect(m_sendButton, &QPushButton::clicked, this, &MainWindow::sendPressed);
     // Disabled while the browsers are asked, which takes at most a couple of seconds.
     connect(m_webPageButton, &QPushButton::clicked, &controller, [this] {
         m_webPageButton->setEnabled(false);
@@ -209,6 +210,35 @@ void MainWindow::createActions() {
     m_quitAction = quit;
     QMenu* window = menuBar()->addMenu(LocalizedStringNS("&Window"));
     window->addActions({addresses, attachments, recipients, console});
+}
+
+void MainWindow::sendPressed() {
+    // Stop, and a group's run, go at once: the checks are for the one copy typed in the fields.
+    if (m_sendButton->text() != LocalizedStringNS("Send") || m_controller->getPeople())
+        return m_controller->send();
+    const QString to = m_to->text().trimmed();
+    if (!IsAddrSpec(to)) {
+        beep();
+        return alert(LocalizedStringNS("The recipient address is not an e-mail address"),
+                     LocalizedStringNS("\"%1\" cannot be mailed. Type an address such as "
+                                       "name@example.org, or choose a person or a group in "
+                                       "Addresses.")
+                         .arg(to));
+    }
+    const auto send = [this] { m_controller->send(); };
+    const auto subjectThenSend = [this, send] {
+        if (m_subject->text().trimmed().isEmpty())
+            askThen(this, LocalizedStringNS("Send without a subject?"), LocalizedStringNS("Send"),
+                    send);
+        else
+            send();
+    };
+    if (m_controller->recipientsContains(to))
+        askThen(this,
+                LocalizedStringNS("%1 was already mailed in this session. Send again?").arg(to),
+                LocalizedStringNS("Send Again"), subjectThenSend);
+    else
+        subjectThenSend();
 }
 
 void MainWindow::setSoftwareUpdate(SoftwareUpdateController& updates) {

@@ -90,6 +90,11 @@ private:
     QWidget* createEditor();
     QWidget* createSendRow();
     void createActions();
+    /**
+     * The Send button: before one copy to the To field, an address is required, and an
+     * address already mailed in this session and an empty subject are asked about.
+     */
+    void sendPressed();
     void connectPicker();
     /** Reports the user's edits of field, never the text the controller puts there. */
     void reportEdits(QLineEdit* edit, PelmoView::Field field);

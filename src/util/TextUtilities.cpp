@@ -1,5 +1,6 @@
 #include "util/TextUtilities.h"
 
+#include <QRegularExpression>
 #include <QStringDecoder>
 
 #include "text/CString256.h"
@@ -180,6 +181,21 @@ QString MimeTypeForPath(const QString& path) {
         return {};
     const QList<QMimeType> types = QMimeDatabase().mimeTypesForFileName(fileName);
     return types.isEmpty() ? QString() : types.first().name();
+}
+
+bool IsAddrSpec(const QString& text) {
+    // atext of RFC 5322 3.2.3 (with any non-ASCII character), qtext and quoted-pair of 3.2.4,
+    // dtext of 3.4.1; \z, as $ would let a final line break through.
+    static const QString atom =
+        QStringLiteral(R"([A-Za-z0-9!#$%&'*+/=?^_`{|}~\x{80}-\x{10FFFF}-]+)");
+    static const QString dotAtom = atom + QStringLiteral(R"((?:\.)") + atom + QStringLiteral(")*");
+    static const QRegularExpression addrSpec(
+        QStringLiteral(R"(\A(?:)") + dotAtom +
+        QStringLiteral(
+            R"(|"(?:[\x{20}\x{21}\x{23}-\x{5B}\x{5D}-\x{7E}\x{80}-\x{10FFFF}]|\\[\x{20}-\x{7E}])*"))") +
+        QStringLiteral("@(?:") + dotAtom +
+        QStringLiteral(R"(|\[[\x{21}-\x{5A}\x{5E}-\x{7E}]*\])\z)"));
+    return addrSpec.match(text).hasMatch();
 }
 
 QString DecodeUtf8Strictly(const QByteArray& bytes) {

@@ -61,6 +61,14 @@ QString MimeTypeForPath(const QString& path);
  */
 QString DecodeUtf8Strictly(const QByteArray& bytes);
 
+/**
+ * Whether text is one e-mail address as RFC 5322 section 3.4.1 writes it (an addr-spec):
+ * a dot-atom or quoted-string local part, "@", and a dot-atom or domain-literal domain. UTF-8
+ * letters count as atom text (RFC 6532 section 3.2). A display name, angle brackets, a list
+ * or surrounding spaces are not an addr-spec.
+ */
+bool IsAddrSpec(const QString& text);
+
 /** A date in the program's one textual form, local time: "2024-05-01 14:03:22 +0200". */
 QString DateDescription(const QDateTime& date);
 

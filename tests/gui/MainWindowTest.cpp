@@ -48,13 +48,26 @@ protected:
         return text;
     }
     QString status() const { return child<QLabel>("status")->text(); }
+    // Answers the question on the window (Cancel being its default) with the button named so.
+    void answer(const QString& question, const QString& button) {
+        auto* box = asked<QMessageBox>();
+        ASSERT_NE(box, nullptr) << "no question";
+        EXPECT_EQ(box->text(), question);
+        EXPECT_EQ(box->defaultButton(), box->button(QMessageBox::Cancel));
+        for (QAbstractButton* choice : box->buttons())
+            if (choice->text() == button)
+                return QTest::mouseClick(choice, Qt::LeftButton);
+        ADD_FAILURE() << "no button " << button.toStdString();
+    }
     ServerProcess server{PELMO_TEST_DIR "/smtp/smtp_server.py", {}};
     bool idle = false;
 };
 
 TEST_F(WindowRun, SendMailsTheTypedRecipientThenAGroup) {
-    press();
-    // A setting that fails stops the run before it starts and frees the button.
+    // An empty subject is asked about; a setting that fails stops the run before it starts.
+    press(false);
+    answer("Send without a subject?", "Send");
+    ASSERT_TRUE(waitUntil([this] { return idle; }));
     EXPECT_TRUE(status().startsWith("Error (NoServer): ")) << status().toStdString();
     EXPECT_EQ(shown(), "Send -1 of 1 /");
     set("serverAddress", "127.0.0.1");
@@ -69,6 +82,10 @@ TEST_F(WindowRun, SendMailsTheTypedRecipientThenAGroup) {
               "Ann <ann@example.org> / News / Hello Ann");
     EXPECT_TRUE(window->recipientsWindow().isVisible());
     EXPECT_EQ(shown(), "Send -1 of 1 / 1 ann@example.org");
+    // Ann again is asked about first; Cancel sends nothing.
+    press(false);
+    answer("ann@example.org was already mailed in this session. Send again?", "Cancel");
+    EXPECT_EQ(server.records().size(), 1);
     QTest::mouseClick(child<QPushButton>("resetButton", &window->recipientsWindow()),
                       Qt::LeftButton);
     EXPECT_EQ(shown(), "Send -1 of 1 /");
@@ -85,6 +102,14 @@ TEST_F(WindowRun, SendMailsTheTypedRecipientThenAGroup) {
     EXPECT_EQ(shown(), "Send 1 of 3 / 1 ann@example.org");
     press(); // goes on with those not yet mailed
     EXPECT_EQ(shown(), "Send -1 of 1 / 1 ann@example.org 2 bob@example.org 3 cy@example.org");
+
+    // A group's name left in To is no address: an alert, and no connection.
+    child<QLineEdit>("to")->setText("Club");
+    press(false);
+    ASSERT_NE(asked<QMessageBox>(), nullptr);
+    EXPECT_EQ(asked<QMessageBox>()->text(), "The recipient address is not an e-mail address");
+    asked<QMessageBox>()->accept();
+    EXPECT_EQ(server.records().size(), 4);
 }
 
 // File ▸ Software Update… opens the window, whose Check Now shows what the site publishes; the

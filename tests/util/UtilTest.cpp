@@ -120,6 +120,8 @@ QString made(const QString& function, const QStringList& args) {
     } else if (function == "date") {
         return DateDescription(
             QDateTime(QDate(2024, 5, 1), QTime(14, 3, 22), QTimeZone(a.toInt())));
+    } else if (function == "addrspec") {
+        return IsAddrSpec(a) ? "address" : "not an address";
     } else if (function == "utf8") {
         const QString text = DecodeUtf8Strictly(QByteArray::fromHex(a.toLatin1()));
         return text.isNull() ? "(not UTF-8)" : text;
