@@ -15,6 +15,7 @@
 
 #include <QAction>
 #include <QApplication>
+#include <QCloseEvent>
 #include <QFormLayout>
 #include <QHBoxLayout>
 #include <QKeySequence>
@@ -142,6 +143,7 @@ QWidget* MainWindow::createSendRow() {
     m_status->setTextInteractionFlags(Qt::TextSelectableByMouse);
     // A long status line is cut at the window's edge rather than widening the window.
     m_status->setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Preferred);
+    m_status->installEventFilter(this);
     m_spinner = new QProgressBar;
     m_spinner->setObjectName(QStringLiteral("spinner"));
     m_spinner->setTextVisible(false);
@@ -155,8 +157,6 @@ QWidget* MainWindow::createSendRow() {
     m_sendButton->setDefault(true);
     m_sendButton->setMinimumWidth(96);
     m_sendButton->setToolTip(LocalizedStringNS("Send the message (Ctrl+Return)"));
-    auto* shortcut = new QShortcut(QKeySequence(Qt::CTRL | Qt::Key_Return), this);
-    connect(shortcut, &QShortcut::activated, m_sendButton, &QPushButton::click);
 
     auto* row = new QWidget;
     auto* layout = new QHBoxLayout(row);
@@ -171,7 +171,8 @@ void MainWindow::createActions() {
     auto* preferences = new QAction(icon("preferences-system", QStyle::SP_FileDialogDetailedView),
                                     LocalizedStringNS("Preferences"), this);
     preferences->setObjectName(QStringLiteral("preferencesAction"));
-    preferences->setShortcut(QKeySequence::Preferences);
+    // Ctrl+, as most desktop applications have it; the platform's own key where it has one.
+    preferences->setShortcuts({QKeySequence(Qt::CTRL | Qt::Key_Comma), QKeySequence::Preferences});
     connect(preferences, &QAction::triggered, this, &MainWindow::showPreferences);
     auto* addresses = new QAction(icon("x-office-address-book", QStyle::SP_DirHomeIcon),
                                   LocalizedStringNS("Addresses"), this);
@@ -192,9 +193,18 @@ void MainWindow::createActions() {
     makeDefault->setObjectName(QStringLiteral("makeDefaultMailClientAction"));
     connect(makeDefault, &QAction::triggered, m_controller,
             &PelmoController::makePelmoDefaultEmailer);
+    auto* send = new QAction(LocalizedStringNS("Send"), this);
+    send->setObjectName(QStringLiteral("sendAction"));
+    send->setShortcut(QKeySequence(Qt::CTRL | Qt::Key_Return));
+    connect(send, &QAction::triggered, m_sendButton, &QPushButton::click);
     auto* quit = new QAction(LocalizedStringNS("Quit"), this);
+    quit->setObjectName(QStringLiteral("quitAction"));
     quit->setShortcut(QKeySequence::Quit);
-    connect(quit, &QAction::triggered, qApp, &QApplication::quit);
+    // Through the window's close, which asks before unsent text is lost.
+    connect(quit, &QAction::triggered, this, [this] {
+        if (close())
+            QCoreApplication::quit();
+    });
 
     auto* tools = addToolBar(LocalizedStringNS("Tools"));
     tools->setObjectName(QStringLiteral("tools"));
@@ -208,12 +218,43 @@ void MainWindow::createActions() {
     m_fileMenu->addSeparator();
     m_fileMenu->addAction(quit);
     m_quitAction = quit;
+    menuBar()->addMenu(LocalizedStringNS("&Message"))->addAction(send);
     QMenu* window = menuBar()->addMenu(LocalizedStringNS("&Window"));
     window->addActions({addresses, attachments, recipients, console});
+    menuBar()
+        ->addMenu(LocalizedStringNS("&Help"))
+        ->addAction(LocalizedStringNS("About Qt"), qApp, &QApplication::aboutQt);
+    // Escape and Ctrl+W close the tool windows, as they close dialogs.
+    for (QWidget* tool :
+         std::initializer_list<QWidget*>{m_picker, m_attachmentsWindow, m_recipients}) {
+        for (const QKeySequence& key :
+             {QKeySequence(Qt::Key_Escape), QKeySequence(QKeySequence::Close)})
+            connect(new QShortcut(key, tool), &QShortcut::activated, tool, &QWidget::close);
+    }
+}
+
+QString MainWindow::draft() const {
+    return m_subject->text() + QChar(0) + m_webPageOrFile->text() + QChar(0) +
+           m_message->toPlainText();
+}
+
+void MainWindow::closeEvent(QCloseEvent* event) {
+    // Text typed since the last Send is the user's work: it goes only when they say so.
+    const QString now = draft();
+    if (m_discarding || now == m_sentDraft || now == QString(2, QChar(0)))
+        return QMainWindow::closeEvent(event);
+    event->ignore();
+    askThen(this, LocalizedStringNS("Discard this message?"), LocalizedStringNS("Discard"), [this] {
+        m_discarding = true;
+        if (close())
+            QCoreApplication::quit();
+    });
 }
 
 void MainWindow::sendPressed() {
     // Stop, and a group's run, go at once: the checks are for the one copy typed in the fields.
+    if (m_sendButton->text() == LocalizedStringNS("Send"))
+        m_sentDraft = draft();
     if (m_sendButton->text() != LocalizedStringNS("Send") || m_controller->getPeople())
         return m_controller->send();
     const QString to = m_to->text().trimmed();
@@ -299,8 +340,21 @@ void MainWindow::setWebPageOrFile(const QString& text) {
 }
 
 void MainWindow::setStatus(const QString& text) {
-    m_status->setText(text);
+    m_statusText = text;
     m_status->setToolTip(text);
+    showStatus();
+}
+
+// A status longer than the line ends in "…"; its tooltip holds the whole of it.
+void MainWindow::showStatus() {
+    m_status->setText(
+        m_status->fontMetrics().elidedText(m_statusText, Qt::ElideRight, m_status->width()));
+}
+
+bool MainWindow::eventFilter(QObject* watched, QEvent* event) {
+    if (watched == m_status && event->type() == QEvent::Resize)
+        showStatus();
+    return QMainWindow::eventFilter(watched, event);
 }
 
 void MainWindow::setProgressCounting(double minimum, double maximum, double value) {

@@ -95,6 +95,15 @@ private:
      * address already mailed in this session and an empty subject are asked about.
      */
     void sendPressed();
+    /** The subject, web page and message as they stand, to tell unsent text from sent. */
+    QString draft() const;
+    void showStatus();
+
+protected:
+    void closeEvent(QCloseEvent* event) override;
+    bool eventFilter(QObject* watched, QEvent* event) override;
+
+private:
     void connectPicker();
     /** Reports the user's edits of field, never the text the controller puts there. */
     void reportEdits(QLineEdit* edit, PelmoView::Field field);
@@ -118,6 +127,9 @@ private:
     AttachmentsWindow* m_attachmentsWindow = nullptr;
     SoftwareUpdateWindow* m_softwareUpdateWindow = nullptr;
     QMenu* m_fileMenu = nullptr;
+    QString m_statusText;
+    QString m_sentDraft = QString(2, QChar(0)); // the draft of the latest Send, empty at first
+    bool m_discarding = false;
     QAction* m_quitAction = nullptr;
     /** The progress indicator's state: a counting bar, or a busy one that may be animated. */
     bool m_busy = true;

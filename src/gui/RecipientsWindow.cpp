@@ -1,6 +1,7 @@
 #include "gui/RecipientsWindow.h"
 
 #include "controller/SentRecipients.h"
+#include "gui/AlertBox.h"
 #include "util/LocalizedStrings.h"
 
 #include <QHBoxLayout>
@@ -25,7 +26,19 @@ RecipientsWindow::RecipientsWindow(SentRecipients& recipients, QWidget* parent)
     auto* reset = new QPushButton(LocalizedStringNS("Reset"));
     reset->setObjectName(QStringLiteral("resetButton"));
     reset->setToolTip(LocalizedStringNS("Forget who was mailed, so that they can be mailed again"));
-    connect(reset, &QPushButton::clicked, &recipients, &SentRecipients::resetRecipients);
+    // Those forgotten may be mailed again, so the list does not go without a question.
+    connect(reset, &QPushButton::clicked, this, [this, &recipients] {
+        const int count = recipients.rowCount();
+        if (count == 0)
+            return;
+        askThen(this,
+                count == 1 ? LocalizedStringNS("Forget the 1 sent recipient? They may be mailed "
+                                               "again.")
+                           : LocalizedStringNS("Forget the %1 sent recipients? They may be mailed "
+                                               "again.")
+                                 .arg(count),
+                LocalizedStringNS("Forget"), [&recipients] { recipients.resetRecipients(); });
+    });
 
     auto* buttons = new QHBoxLayout;
     buttons->addStretch(1);

@@ -88,6 +88,7 @@ TEST_F(WindowRun, SendMailsTheTypedRecipientThenAGroup) {
     EXPECT_EQ(server.records().size(), 1);
     QTest::mouseClick(child<QPushButton>("resetButton", &window->recipientsWindow()),
                       Qt::LeftButton);
+    answer("Forget the 1 sent recipient? They may be mailed again.", "Forget");
     EXPECT_EQ(shown(), "Send -1 of 1 /");
 
     // A group counts on the bar, and Stop lets the copy on its way finish.
@@ -110,6 +111,19 @@ TEST_F(WindowRun, SendMailsTheTypedRecipientThenAGroup) {
     EXPECT_EQ(asked<QMessageBox>()->text(), "The recipient address is not an e-mail address");
     asked<QMessageBox>()->accept();
     EXPECT_EQ(server.records().size(), 4);
+}
+
+// Quitting with unsent text asks first; a long status line ends in "…" with the whole of it in
+// the tooltip.
+TEST_F(WindowRun, QuitAsksForUnsentTextLongStatusElided) {
+    const QString longText = QString("Error (NoServer): ") + QString(300, 'x');
+    window->setStatus(longText);
+    EXPECT_TRUE(status().endsWith(QChar(0x2026)) && status().size() < longText.size());
+    EXPECT_EQ(child<QLabel>("status")->toolTip(), longText);
+    QTest::keyClicks(child<QLineEdit>("subject"), "Draft");
+    child<QAction>("quitAction")->trigger();
+    answer("Discard this message?", "Cancel");
+    EXPECT_TRUE(window->isVisible());
 }
 
 // File ▸ Software Update… opens the window, whose Check Now shows what the site publishes; the
