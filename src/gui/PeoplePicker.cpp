@@ -6,6 +6,7 @@
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
 
+#include <QFileSystemWatcher>
 #include <QHBoxLayout>
 #include <QInputDialog>
 #include <QLabel>
@@ -15,6 +16,7 @@
 #include <QPushButton>
 #include <QSignalBlocker>
 #include <QSplitter>
+#include <QTimer>
 #include <QVBoxLayout>
 
 namespace {
@@ -81,6 +83,7 @@ PeoplePicker::PeoplePicker(AddressBook& addressBook, QWidget* parent)
     connect(m_persons, &QListWidget::itemSelectionChanged, this, &PeoplePicker::personsChosen);
     connect(m_addresses, &QListWidget::itemSelectionChanged, this, &PeoplePicker::addressChosen);
     connect(m_persons, &QListWidget::itemDoubleClicked, this, &PeoplePicker::editPerson);
+    watchBook();
     reload();
     resize(760, 440);
 }
@@ -187,6 +190,23 @@ void PeoplePicker::addressChosen() {
 }
 
 // Filling the lists: never a selection signal, since no user chose anything.
+
+// Contacts another program adds (pelmo contacts import in a terminal) show without a restart.
+// A commit may touch the file several times: one reload for a burst of changes.
+void PeoplePicker::watchBook() {
+    auto* watcher = new QFileSystemWatcher({m_book.path()}, this);
+    auto* settle = new QTimer(this);
+    settle->setSingleShot(true);
+    settle->setInterval(200);
+    connect(settle, &QTimer::timeout, this, &PeoplePicker::reload);
+    connect(watcher, &QFileSystemWatcher::fileChanged, this,
+            [watcher, settle](const QString& path) {
+                // A file replaced by a rename is no longer watched.
+                if (!watcher->files().contains(path))
+                    watcher->addPath(path);
+                settle->start();
+            });
+}
 
 void PeoplePicker::reload() {
     const QList<qint64> groups = selectedGroups();

@@ -48,6 +48,7 @@ Q_SIGNALS:
                                   const QStringList& selectedAddresses, bool pickerIsKeyWindow);
 
 private:
+    void watchBook();
     QWidget* createColumn(const char* title, QListWidget* list, QList<QWidget*> buttons);
     QWidget* createGroupColumn();
     QWidget* createPersonColumn();

@@ -176,4 +176,12 @@ TEST_F(Picker, ThePersonDialogSavesOnlyWhatTheBookTakes) {
               "Cy Cole / dee@example.org");
 }
 
+// A person another program adds to the same file shows without a restart.
+TEST_F(Picker, ShowsWhatAnotherProgramAdds) {
+    AddressBook other(book->path());
+    other.addPerson({0, "Dee", "Other", {"dee@example.org"}, 0});
+    EXPECT_TRUE(waitUntil([this] { return rows("persons").contains("Dee Other"); }))
+        << rows("persons").toStdString();
+}
+
 } // namespace
