@@ -5,6 +5,7 @@
 #include "gui/AlertBox.h"
 #include "gui/AttachmentsWindow.h"
 #include "gui/FormattingToolBar.h"
+#include "gui/LogWindow.h"
 #include "gui/PeoplePicker.h"
 #include "gui/PreferencesDialog.h"
 #include "gui/RecipientsWindow.h"
@@ -182,7 +183,11 @@ void MainWindow::createActions() {
                                 LocalizedStringNS("Console"), this);
     console->setObjectName(QStringLiteral("consoleAction"));
     console->setToolTip(LocalizedStringNS("Show the activity log"));
-    connect(console, &QAction::triggered, m_controller, &PelmoController::openConsole);
+    connect(console, &QAction::triggered, this, [this] {
+        if (!m_logWindow)
+            m_logWindow = new LogWindow(*m_controller, this);
+        m_logWindow->showLog();
+    });
     auto* attachments = new QAction(icon("mail-attachment", QStyle::SP_FileIcon),
                                     LocalizedStringNS("Attachments"), this);
     attachments->setObjectName(QStringLiteral("attachmentsAction"));

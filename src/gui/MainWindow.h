@@ -17,6 +17,7 @@ class QLineEdit;
 class QProgressBar;
 class QPushButton;
 class QTextEdit;
+class LogWindow;
 class RecipientsWindow;
 class SoftwareUpdateController;
 class SoftwareUpdateWindow;
@@ -126,6 +127,7 @@ private:
     PreferencesDialog* m_preferences = nullptr;
     AttachmentsWindow* m_attachmentsWindow = nullptr;
     SoftwareUpdateWindow* m_softwareUpdateWindow = nullptr;
+    LogWindow* m_logWindow = nullptr;
     QMenu* m_fileMenu = nullptr;
     QString m_statusText;
     QString m_sentDraft = QString(2, QChar(0)); // the draft of the latest Send, empty at first

@@ -98,13 +98,17 @@ void LogEntry(const char* text) {
     gLogger->write_entry(line);
 }
 
-void OpenConsole() {
+QString LogFilePath() {
     std::filesystem::path folder;
     if (!GetOurApplicationSupportFolder(folder))
-        return;
-    const std::filesystem::path log = folder / kLogFileName;
+        return {};
+    return QString::fromStdString((folder / kLogFileName).string());
+}
+
+void OpenConsole() {
+    const QString log = LogFilePath();
     std::error_code error;
-    if (!std::filesystem::is_regular_file(log, error))
+    if (log.isNull() || !std::filesystem::is_regular_file(log.toStdString(), error))
         return;
-    QDesktopServices::openUrl(QUrl::fromLocalFile(QString::fromStdString(log.string())));
+    QDesktopServices::openUrl(QUrl::fromLocalFile(log));
 }

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <QString>
+
 class CString256;
 
 /**
@@ -49,5 +51,7 @@ void StopLogging();
  * CString256, so text past 255 bytes is cut and a 255-byte text loses its carriage return.
  */
 void LogEntry(const char* text);
+/** The log file's path, <data folder>/Pelmo.log; null when the data folder cannot be had. */
+QString LogFilePath();
 /** Shows the log file in the desktop's default application; nothing when there is none yet. */
 void OpenConsole();

@@ -1,6 +1,7 @@
 #include "GuiFixture.h"
 #include "QtTestMain.h"
 #include "e2e/E2eSupport.h"
+#include "gui/LogWindow.h"
 #include "gui/PreferencesDialog.h"
 #include "gui/RecipientsWindow.h"
 #include "gui/SoftwareUpdateWindow.h"
@@ -8,6 +9,7 @@
 
 #include <QLabel>
 #include <QMetaProperty>
+#include <QPlainTextEdit>
 #include <QProgressBar>
 #include <QTableView>
 #include <QTextEdit>
@@ -114,8 +116,17 @@ TEST_F(WindowRun, SendMailsTheTypedRecipientThenAGroup) {
 }
 
 // Quitting with unsent text asks first; a long status line ends in "…" with the whole of it in
-// the tooltip.
-TEST_F(WindowRun, QuitAsksForUnsentTextLongStatusElided) {
+// the tooltip; Console shows the log in Pelmo's own window, following lines written after.
+TEST_F(WindowRun, QuitAsksForUnsentTextLongStatusElidedLogWindowFollows) {
+    pelmo->applicationWillFinishLaunching();
+    child<QAction>("consoleAction")->trigger();
+    auto* log = child<QPlainTextEdit>("logText", window->findChild<LogWindow*>());
+    EXPECT_TRUE(log->toPlainText().startsWith("[Logging starting at "))
+        << log->toPlainText().toStdString();
+    pelmo->statusMsg("Written after the window opened");
+    EXPECT_TRUE(waitUntil(
+        [log] { return log->toPlainText().contains("\nWritten after the window opened\n"); }));
+    pelmo->applicationWillTerminate();
     const QString longText = QString("Error (NoServer): ") + QString(300, 'x');
     window->setStatus(longText);
     EXPECT_TRUE(status().endsWith(QChar(0x2026)) && status().size() < longText.size());
