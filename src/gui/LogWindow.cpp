@@ -11,6 +11,7 @@
 #include <QPlainTextEdit>
 #include <QPushButton>
 #include <QScrollBar>
+#include <QShortcut>
 #include <QTextCursor>
 #include <QVBoxLayout>
 
@@ -36,6 +37,9 @@ LogWindow::LogWindow(PelmoController& controller, QWidget* parent)
     layout->addLayout(bar);
     layout->addWidget(m_text, 1);
     resize(720, 480);
+    for (const QKeySequence& key :
+         {QKeySequence(Qt::Key_Escape), QKeySequence(QKeySequence::Close)})
+        connect(new QShortcut(key, this), &QShortcut::activated, this, &QWidget::close);
 
     // The log grows while Pelmo runs; the window follows it.
     auto* watcher = new QFileSystemWatcher(this);
