@@ -1,5 +1,7 @@
 #include "browser/FirefoxSession.h"
 
+#include "util/IniFile.h"
+
 #include <QDateTime>
 #include <QDir>
 #include <QFile>
@@ -20,30 +22,6 @@ bool fail(QString* why, const QString& reason) {
     if (why)
         *why = reason;
     return false;
-}
-
-// One [section] of an ini file, its keys in a hash.
-struct IniSection {
-    QString name;
-    QHash<QString, QString> keys;
-};
-
-// Firefox's ini files are plain: [sections], key=value lines, no quoting, no escapes.
-QList<IniSection> readIni(const QString& path) {
-    QFile file(path);
-    QList<IniSection> sections;
-    if (!file.open(QIODevice::ReadOnly))
-        return sections;
-    for (const QByteArray& raw : file.read(1024 * 1024).split('\n')) {
-        if (raw.contains('\0')) // no path holds one; Qt warns of every such name it is given
-            continue;
-        const QString line = QString::fromUtf8(raw).trimmed();
-        if (line.startsWith('[') && line.endsWith(']'))
-            sections.append({line.mid(1, line.size() - 2), {}});
-        else if (const qsizetype eq = line.indexOf('='); eq > 0 && !sections.isEmpty())
-            sections.last().keys.insert(line.left(eq).trimmed(), line.mid(eq + 1).trimmed());
-    }
-    return sections;
 }
 
 QString sessionFile(const QString& folder) {
@@ -156,7 +134,8 @@ QString FirefoxSession::profileFolder(const QString& firefoxHome, const QStringL
     }
 
     const QDir home(firefoxHome);
-    const QList<IniSection> ini = readIni(home.filePath(QStringLiteral("profiles.ini")));
+    const QList<IniFile::Group> ini =
+        IniFile(home.filePath(QStringLiteral("profiles.ini"))).groups();
     if (ini.isEmpty())
         return fail(why, QStringLiteral("no profiles.ini in %1").arg(firefoxHome)), QString();
     const auto folderOf = [&](const QHash<QString, QString>& keys) {
@@ -166,7 +145,7 @@ QString FirefoxSession::profileFolder(const QString& firefoxHome, const QStringL
                    : path;
     };
     QList<QHash<QString, QString>> profiles;
-    for (const IniSection& section : ini)
+    for (const IniFile::Group& section : ini)
         if (section.name.startsWith(QStringLiteral("Profile")) &&
             !section.keys.value(QStringLiteral("Path")).isEmpty())
             profiles.append(section.keys);
@@ -191,14 +170,15 @@ QString FirefoxSession::profileFolder(const QString& firefoxHome, const QStringL
     }
 
     // Each installation names its default profile; the most recently saved one is in use.
-    QList<IniSection> installs = readIni(home.filePath(QStringLiteral("installs.ini")));
+    QList<IniFile::Group> installs =
+        IniFile(home.filePath(QStringLiteral("installs.ini"))).groups();
     if (installs.isEmpty())
-        for (const IniSection& section : ini)
+        for (const IniFile::Group& section : ini)
             if (section.name.startsWith(QStringLiteral("Install")))
                 installs.append(section);
     QString newest;
     QDateTime newestTime;
-    for (const IniSection& install : installs) {
+    for (const IniFile::Group& install : installs) {
         const QString path = install.keys.value(QStringLiteral("Default"));
         if (path.isEmpty())
             continue;

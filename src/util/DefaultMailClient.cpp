@@ -1,6 +1,7 @@
 #include "util/DefaultMailClient.h"
 
 #include "util/CLog.h"
+#include "util/IniFile.h"
 #include "util/PrivateFiles.h"
 
 #include <QDir>
@@ -23,19 +24,10 @@ QByteArray keyOf(const QByteArray& line) {
 }
 
 // The applications the file's [Default Applications] group lists for mailto, best first.
-QList<QByteArray> mailtoDefaultsIn(const QString& path) {
-    QFile file(path);
-    if (!file.open(QIODevice::ReadOnly))
-        return {};
-    bool inDefaults = false;
-    for (const QByteArray& raw : file.readAll().split('\n')) {
-        const QByteArray line = raw.trimmed();
-        if (line.startsWith('['))
-            inDefaults = line == kDefaults;
-        else if (inDefaults && line.contains('=') && keyOf(line) == kMailto)
-            return line.mid(line.indexOf('=') + 1).split(';');
-    }
-    return {};
+QStringList mailtoDefaultsIn(const QString& path) {
+    return IniFile(path)
+        .value(QStringLiteral("Default Applications"), QLatin1String(kMailto))
+        .split(';', Qt::SkipEmptyParts);
 }
 
 // A desktop id names a file of an applications folder, or of a folder in it: "kde4-kmail.desktop"
@@ -71,14 +63,11 @@ QString anyMailClient(const QStringList& dataFolders) {
             paths << it.next();
         paths.sort();
         for (const QString& path : std::as_const(paths)) {
-            QFile file(path);
-            if (!file.open(QIODevice::ReadOnly))
-                continue;
-            for (const QByteArray& line : file.readAll().split('\n')) {
-                if (keyOf(line) == "MimeType" &&
-                    line.mid(line.indexOf('=') + 1).trimmed().split(';').contains(kMailto))
-                    return path.mid(applications.size()).replace('/', '-');
-            }
+            if (IniFile(path)
+                    .value(QStringLiteral("Desktop Entry"), QStringLiteral("MimeType"))
+                    .split(';')
+                    .contains(QLatin1String(kMailto)))
+                return path.mid(applications.size()).replace('/', '-');
         }
     }
     return {};
@@ -140,8 +129,8 @@ QString DefaultMailClient() {
         folders << folder + QLatin1String("/applications");
     for (const QString& folder : folders) {
         for (const QString& name : names) {
-            for (const QByteArray& entry : mailtoDefaultsIn(folder + '/' + name)) {
-                const QString id = QString::fromUtf8(entry.trimmed());
+            for (const QString& entry : mailtoDefaultsIn(folder + '/' + name)) {
+                const QString id = entry.trimmed();
                 if (isInstalled(id, data))
                     return id;
             }
@@ -151,19 +140,11 @@ QString DefaultMailClient() {
 }
 
 QString ApplicationName(const QString& id) {
-    QFile file(
-        desktopFile(id, QStandardPaths::standardLocations(QStandardPaths::GenericDataLocation)));
-    if (!file.open(QIODevice::ReadOnly))
-        return id;
-    bool inEntry = false;
-    for (const QByteArray& raw : file.readAll().split('\n')) {
-        const QByteArray line = raw.trimmed();
-        if (line.startsWith('['))
-            inEntry = line == "[Desktop Entry]";
-        else if (inEntry && line.contains('=') && keyOf(line) == "Name")
-            return QString::fromUtf8(line.mid(line.indexOf('=') + 1).trimmed());
-    }
-    return id;
+    const QString name =
+        IniFile(
+            desktopFile(id, QStandardPaths::standardLocations(QStandardPaths::GenericDataLocation)))
+            .value(QStringLiteral("Desktop Entry"), QStringLiteral("Name"));
+    return name.isEmpty() ? id : name;
 }
 
 QString UserMimeAppsList() {
