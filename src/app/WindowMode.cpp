@@ -6,6 +6,7 @@
 #include "controller/PasswordStore.h"
 #include "controller/PelmoController.h"
 #include "gui/MainWindow.h"
+#include "gui/ToolWindows.h"
 #include "update/SoftwareUpdateController.h"
 #include "util/AppIdentity.h"
 #include "util/LocalizedStrings.h"
@@ -28,10 +29,7 @@ void acceptHandOvers(SingleInstance& instance, MainWindow& window, PelmoControll
     QObject::connect(&instance, &SingleInstance::received, &window,
                      [&window, &controller](const QString& link) {
                          controller.handleGetURLEvent(link);
-                         window.setWindowState(window.windowState() & ~Qt::WindowMinimized);
-                         window.show();
-                         window.raise();
-                         window.activateWindow();
+                         bringToFront(&window);
                      });
 }
 

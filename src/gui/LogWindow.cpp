@@ -1,6 +1,7 @@
 #include "gui/LogWindow.h"
 
 #include "controller/PelmoController.h"
+#include "gui/ToolWindows.h"
 #include "util/CLog.h"
 #include "util/LocalizedStrings.h"
 
@@ -11,7 +12,6 @@
 #include <QPlainTextEdit>
 #include <QPushButton>
 #include <QScrollBar>
-#include <QShortcut>
 #include <QTextCursor>
 #include <QVBoxLayout>
 
@@ -37,9 +37,7 @@ LogWindow::LogWindow(PelmoController& controller, QWidget* parent)
     layout->addLayout(bar);
     layout->addWidget(m_text, 1);
     resize(720, 480);
-    for (const QKeySequence& key :
-         {QKeySequence(Qt::Key_Escape), QKeySequence(QKeySequence::Close)})
-        connect(new QShortcut(key, this), &QShortcut::activated, this, &QWidget::close);
+    closeOnEscape(this);
 
     // The log grows while Pelmo runs; the window follows it.
     auto* watcher = new QFileSystemWatcher(this);
@@ -51,9 +49,7 @@ LogWindow::LogWindow(PelmoController& controller, QWidget* parent)
 
 void LogWindow::showLog() {
     readMore();
-    show();
-    raise();
-    activateWindow();
+    bringToFront(this);
 }
 
 void LogWindow::readMore() {

@@ -10,6 +10,7 @@
 #include "gui/PreferencesDialog.h"
 #include "gui/RecipientsWindow.h"
 #include "gui/SoftwareUpdateWindow.h"
+#include "gui/ToolWindows.h"
 #include "update/SoftwareUpdateController.h"
 #include "util/LocalizedStrings.h"
 #include "util/TextUtilities.h"
@@ -25,7 +26,6 @@
 #include <QMenuBar>
 #include <QProgressBar>
 #include <QPushButton>
-#include <QShortcut>
 #include <QStyle>
 #include <QTextEdit>
 #include <QToolBar>
@@ -229,13 +229,10 @@ void MainWindow::createActions() {
     menuBar()
         ->addMenu(LocalizedStringNS("&Help"))
         ->addAction(LocalizedStringNS("About Qt"), qApp, &QApplication::aboutQt);
-    // Escape and Ctrl+W close the tool windows, as they close dialogs.
     for (QWidget* tool :
-         std::initializer_list<QWidget*>{m_picker, m_attachmentsWindow, m_recipients}) {
-        for (const QKeySequence& key :
-             {QKeySequence(Qt::Key_Escape), QKeySequence(QKeySequence::Close)})
-            connect(new QShortcut(key, tool), &QShortcut::activated, tool, &QWidget::close);
-    }
+         {static_cast<QWidget*>(m_picker), static_cast<QWidget*>(m_attachmentsWindow),
+          static_cast<QWidget*>(m_recipients)})
+        closeOnEscape(tool);
 }
 
 QString MainWindow::draft() const {
@@ -291,11 +288,11 @@ void MainWindow::setSoftwareUpdate(SoftwareUpdateController& updates) {
     auto* open = new QAction(LocalizedStringNS("Software Update…"), this);
     open->setObjectName(QStringLiteral("softwareUpdateAction"));
     connect(open, &QAction::triggered, this, [this, &updates] {
-        if (!m_softwareUpdateWindow)
+        if (!m_softwareUpdateWindow) {
             m_softwareUpdateWindow = new SoftwareUpdateWindow(updates, this);
-        m_softwareUpdateWindow->show();
-        m_softwareUpdateWindow->raise();
-        m_softwareUpdateWindow->activateWindow();
+            closeOnEscape(m_softwareUpdateWindow);
+        }
+        bringToFront(m_softwareUpdateWindow);
     });
     m_fileMenu->insertAction(
         m_fileMenu->actions().at(m_fileMenu->actions().indexOf(m_quitAction) - 1), open);
@@ -418,9 +415,7 @@ void MainWindow::setSendButtonTitle(const QString& title) {
 }
 
 void MainWindow::showRecipientsWindow() {
-    m_recipients->show();
-    m_recipients->raise();
-    m_recipients->activateWindow();
+    bringToFront(m_recipients);
 }
 
 void MainWindow::alert(const QString& title, const QString& informativeText) {
@@ -432,15 +427,11 @@ void MainWindow::beep() {
 }
 
 void MainWindow::showPeoplePicker() {
-    m_picker->show();
-    m_picker->raise();
-    m_picker->activateWindow();
+    bringToFront(m_picker);
 }
 
 void MainWindow::showAttachments() {
-    m_attachmentsWindow->show();
-    m_attachmentsWindow->raise();
-    m_attachmentsWindow->activateWindow();
+    bringToFront(m_attachmentsWindow);
 }
 
 void MainWindow::showPreferences() {
