@@ -44,8 +44,7 @@ void FrontPageQuery::start() {
     else
         ask(m_url);
     // One browser answers both questions once.
-    if (m_title.browser && m_url.browser &&
-        m_title.browser->process.pid != m_url.browser->process.pid)
+    if (m_title.browser && !askedOnce())
         ask(m_title);
     // Answers read at once are given on the main loop, as the ones that come later are.
     QTimer::singleShot(0, this, &FrontPageQuery::answered);
@@ -92,12 +91,16 @@ void FrontPageQuery::ask(Answer& answer) {
     download->start(QStringLiteral("http://127.0.0.1:%1/json/list").arg(port), m_places.timeout);
 }
 
+bool FrontPageQuery::askedOnce() const {
+    return m_title.browser && m_url.browser &&
+           m_title.browser->process.pid == m_url.browser->process.pid;
+}
+
 void FrontPageQuery::answered() {
     if (m_state != State::Asking || m_url.pending || m_title.pending)
         return;
     m_state = State::Finished;
-    if (m_title.browser && m_url.browser &&
-        m_title.browser->process.pid == m_url.browser->process.pid)
+    if (askedOnce())
         m_title = m_url;
     QString url = m_url.page ? m_url.page->url : QString();
     QString why = m_url.why;

@@ -65,6 +65,8 @@ private:
     };
     void ask(Answer& answer);
     void answered();
+    /** The same browser answers for the title and the address: it is asked once. */
+    bool askedOnce() const;
 
     Places m_places;
     State m_state = State::Idle;
