@@ -4,6 +4,7 @@
 #include "browser/PageDownload.h"
 #include "controller/MailSettings.h"
 #include "controller/MessageTemplate.h"
+#include "controller/NotMailedRecipients.h"
 #include "controller/PasswordStore.h"
 #include "controller/PelmoView.h"
 #include "controller/RecipientSelection.h"
@@ -113,10 +114,12 @@ bool MailingRun::sendMember() {
     PelmoView& view = m_parts.view;
     view.setProgressValue(view.progressMaximum() - static_cast<double>(people->size()) + 1.0);
     const Person person = m_parts.selection.takeFirst();
+    m_member = person;
     view.setName(RecipientSelection::firstAndLastName(person));
     // A person without an address is taken off all the same: the run stalls there, since the
     // next person is only taken when a connection closes.
     if (person.emails.isEmpty()) {
+        memberNotMailed(LocalizedStringNS("No e-mail address."));
         enter(State::Stalled);
     } else {
         view.setTo(person.primaryEmail());
@@ -139,13 +142,19 @@ void MailingRun::deliver() {
     m_delivery = delivery;
     enter(State::Delivering);
     connect(delivery, &SMTP::statusMessage, this, &MailingRun::statusMessage);
-    connect(delivery, &SMTP::accepted, &m_parts.sent, &SentRecipients::addRecipient);
-    connect(delivery, &SMTP::refused, this, [this] {
+    connect(delivery, &SMTP::accepted, this, [this](const QString& recipient) {
+        m_member.reset();
+        m_parts.sent.addRecipient(recipient);
+        m_parts.notMailed.removeAddress(recipient);
+    });
+    connect(delivery, &SMTP::refused, this, [this, delivery] {
+        memberNotMailed(delivery->failureReason());
         m_everyCopyAccepted = false;
         m_parts.view.beep();
         abort();
     });
-    connect(delivery, &SMTP::stalled, this, [this] {
+    connect(delivery, &SMTP::stalled, this, [this, delivery] {
+        memberNotMailed(delivery->failureReason());
         m_everyCopyAccepted = false;
         enter(State::Stalled);
         settleUnlessDelivering();
@@ -228,6 +237,8 @@ void MailingRun::deliveryFinished(SMTP* delivery) {
     delivery->deleteLater();
     if (m_delivery == delivery)
         m_delivery = nullptr;
+    if (!delivery->succeeded())
+        memberNotMailed(delivery->failureReason());
     switch (delivery->state()) {
     case SMTP::State::Ended:
         if (!delivery->succeeded())
@@ -251,8 +262,20 @@ void MailingRun::deliveryFinished(SMTP* delivery) {
 
 void MailingRun::halt(const PelmoException& failure) {
     m_everyCopyAccepted = false;
-    status(LocalizedFormat("Error (%@): %@", {failure.name(), failure.reason()}));
+    const QString text = LocalizedFormat("Error (%@): %@", {failure.name(), failure.reason()});
+    status(text);
+    memberNotMailed(text);
     showHalted();
+}
+
+void MailingRun::memberNotMailed(const QString& why) {
+    if (!m_member)
+        return;
+    m_parts.notMailed.addPerson(
+        *m_member, why.isEmpty() ? LocalizedStringNS("The connection closed before the message "
+                                                     "was accepted.")
+                                 : why);
+    m_member.reset();
 }
 
 void MailingRun::showHalted() {

@@ -1,15 +1,18 @@
 #pragma once
 
+#include "addressbook/Person.h"
 #include "smtp/DeliveryRequest.h"
 
 #include <QObject>
 #include <QPointer>
 
 #include <functional>
+#include <optional>
 
 class AttachmentsController;
 class MailSettings;
 class MessageTemplate;
+class NotMailedRecipients;
 class PageDownload;
 class PasswordStore;
 class PelmoView;
@@ -25,7 +28,8 @@ class SmtpSession;
  * the view's bar and Send/Stop button, every step to statusMessage().
  *
  * The parts are not owned and must outlive the run. A run stopped by the user lets the copy on
- * its way finish and leaves the persons not yet mailed pending for the next Send.
+ * its way finish and leaves the persons not yet mailed pending for the next Send. A member
+ * taken off the list whose copy is not accepted goes to the not-mailed list with the reason.
  */
 class MailingRun : public QObject {
     Q_OBJECT
@@ -40,6 +44,7 @@ public:
         MessageTemplate& message;
         RecipientSelection& selection;
         SentRecipients& sent;
+        NotMailedRecipients& notMailed;
         PasswordStore& passwords;
         const AttachmentsController& attachments;
         SessionFactory createSession;
@@ -95,12 +100,16 @@ private:
     void enter(State state);
     void status(const QString& text) { Q_EMIT statusMessage(text); }
     void settleUnlessDelivering();
+    /** The member on the way was not mailed, for why; once per member. */
+    void memberNotMailed(const QString& why);
 
     Parts m_parts;
     State m_state = State::Idle;
     bool m_stopSending = false;
     bool m_everyCopyAccepted = true;
     QString m_typedAddress;
+    /** The member whose copy is on its way, until it is accepted or listed as not mailed. */
+    std::optional<Person> m_member;
     QPointer<PageDownload> m_download;
     QPointer<SMTP> m_delivery;
 };

@@ -3,6 +3,7 @@
 #include "attachments/AttachmentsController.h"
 #include "controller/MailSettings.h"
 #include "controller/MessageTemplate.h"
+#include "controller/NotMailedRecipients.h"
 #include "controller/RecipientSelection.h"
 #include "controller/SentRecipients.h"
 #include "smtp/SmtpClient.h"
@@ -19,6 +20,7 @@ PelmoController::PelmoController(PelmoView& view, AddressBook& book, PasswordSto
                                  MailSettings& settings, QObject* parent)
     : QObject(parent), window(view), addressBook(book), passwords(store), defaults(settings),
       content(new MessageTemplate(view, settings, this)), recipients(new SentRecipients(this)),
+      notMailed(new NotMailedRecipients(this)),
       recipientSelection(new RecipientSelection(book, view, *recipients, this)),
       attachments(new AttachmentsController(this)) {
     connect(recipientSelection, &RecipientSelection::statusMessage, this,
@@ -30,6 +32,7 @@ PelmoController::~PelmoController() = default;
 void PelmoController::startUp() {
     recipientSelection->clear();
     recipients->resetRecipients();
+    notMailed->clear();
     if (const QString defaultTo = getDefaultTo(); !defaultTo.isNull())
         window.setTo(defaultTo);
     if (const QString defaultToName = getDefaultToName(); !defaultToName.isNull())
@@ -59,8 +62,8 @@ void PelmoController::send() {
     if (run && !run->isDelivering())
         run->deleteLater();
     run = new MailingRun(
-        {window, defaults, *content, *recipientSelection, *recipients, passwords, *attachments,
-         [this](const QString& host, int port) { return createSession(host, port); }},
+        {window, defaults, *content, *recipientSelection, *recipients, *notMailed, passwords,
+         *attachments, [this](const QString& host, int port) { return createSession(host, port); }},
         this);
     MailingRun* started = run;
     connect(started, &MailingRun::statusMessage, this, &PelmoController::statusMsg);
@@ -247,6 +250,17 @@ bool PelmoController::recipientsContains(const QString& address) const {
 
 void PelmoController::resetRecipients() {
     recipients->resetRecipients();
+}
+
+void PelmoController::putBackNotMailed(const QList<int>& rows) {
+    const QList<Person> persons = notMailed->takePersons(rows);
+    if (persons.isEmpty())
+        return;
+    recipientSelection->putBack(persons);
+    statusMsg(
+        persons.size() == 1
+            ? LocalizedStringNS("1 recipient put back, to be mailed first.")
+            : LocalizedStringNS("%1 recipients put back, to be mailed first.").arg(persons.size()));
 }
 
 void PelmoController::abGroupSelected(const QList<qint64>& groupIds, bool pickerIsKeyWindow) {

@@ -17,6 +17,7 @@ class AddressBook;
 class AttachmentsController;
 class MailSettings;
 class MessageTemplate;
+class NotMailedRecipients;
 class PasswordStore;
 
 class QTextDocument;
@@ -59,6 +60,8 @@ public:
     RecipientSelection& selection() const { return *recipientSelection; }
     /** The sent-recipients list, a model the Sent Recipients window shows. */
     SentRecipients& sentRecipients() const { return *recipients; }
+    /** The group members whose copy was not accepted, with why, a model the window shows. */
+    NotMailedRecipients& notMailedRecipients() const { return *notMailed; }
     /** The files every message carries. */
     AttachmentsController& getAttachments() const { return *attachments; }
 
@@ -141,6 +144,11 @@ public:
     const std::optional<QList<Person>>& getPeople() const;
     bool recipientsContains(const QString& address) const;
     void resetRecipients();
+    /**
+     * Puts the not-mailed rows given (all when rows is empty) back in front of the pending
+     * members, so that the next Send, or the run under way, mails them first.
+     */
+    void putBackNotMailed(const QList<int>& rows);
 
 public Q_SLOTS:
     /** The picker's group selection changed; see RecipientSelection. */
@@ -169,6 +177,7 @@ private:
     MailSettings& defaults;
     MessageTemplate* content;
     SentRecipients* recipients;
+    NotMailedRecipients* notMailed;
     RecipientSelection* recipientSelection;
     AttachmentsController* attachments;
     MailingRun::SessionFactory sessionFactory;

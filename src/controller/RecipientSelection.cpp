@@ -2,10 +2,57 @@
 
 #include "addressbook/AddressBook.h"
 #include "controller/SentRecipients.h"
+#include "util/LocalizedStrings.h"
+
+#include <algorithm>
 
 RecipientSelection::RecipientSelection(AddressBook& addressBook, PelmoView& pelmoView,
                                        const SentRecipients& sentRecipients, QObject* parent)
-    : QObject(parent), book(addressBook), view(pelmoView), sent(sentRecipients) {}
+    : QObject(parent), book(addressBook), view(pelmoView), sent(sentRecipients) {
+    connect(&sent, &SentRecipients::rowsInserted, this, &RecipientSelection::summaryChanged);
+    connect(&sent, &SentRecipients::modelReset, this, &RecipientSelection::summaryChanged);
+}
+
+void RecipientSelection::setPeople(const QList<Person>& persons) {
+    people = persons;
+    Q_EMIT summaryChanged();
+}
+
+void RecipientSelection::clear() {
+    dropPeople();
+    Q_EMIT summaryChanged();
+}
+
+void RecipientSelection::dropPeople() {
+    people.reset();
+    groupName.clear();
+    groupAddresses.clear();
+}
+
+void RecipientSelection::putBack(const QList<Person>& persons) {
+    QList<Person> pending = persons;
+    for (const Person& person : people.value_or(QList<Person>()))
+        if (std::none_of(persons.cbegin(), persons.cend(),
+                         [&person](const Person& back) { return back.id == person.id; }))
+            pending.append(person);
+    setPeople(pending);
+}
+
+QString RecipientSelection::summary() const {
+    if (!people)
+        return QString();
+    if (groupName.isNull())
+        return people->size() == 1 ? LocalizedStringNS("1 recipient to mail")
+                                   : LocalizedStringNS("%1 recipients to mail").arg(people->size());
+    const auto mailed =
+        std::count_if(groupAddresses.cbegin(), groupAddresses.cend(),
+                      [this](const QString& address) { return sent.recipientsContains(address); });
+    const QString members = groupAddresses.size() == 1
+                                ? LocalizedStringNS("1 member")
+                                : LocalizedStringNS("%1 members").arg(groupAddresses.size());
+    return LocalizedStringNS("Group %1: %2, %3 already mailed")
+        .arg(groupName, members, QString::number(mailed));
+}
 
 QString RecipientSelection::firstAndLastName(const Person& person) {
     const auto part = [](const QString& text) {
@@ -15,7 +62,9 @@ QString RecipientSelection::firstAndLastName(const Person& person) {
 }
 
 Person RecipientSelection::takeFirst() {
-    return people->takeFirst();
+    const Person first = people->takeFirst();
+    Q_EMIT summaryChanged();
+    return first;
 }
 
 void RecipientSelection::filterPeopleByRecipients() {
@@ -50,13 +99,18 @@ void RecipientSelection::abGroupSelected(const QList<qint64>& groupIds, bool pic
     if (!members)
         return;
     people = std::move(members);
+    groupName = group ? group->name : QString();
+    groupAddresses.clear();
+    for (const Person& member : std::as_const(*people))
+        groupAddresses << member.primaryEmail();
     filterPeopleByRecipients();
+    Q_EMIT summaryChanged();
 }
 
 void RecipientSelection::abRecordSelected(const QList<qint64>& personIds,
                                           const QStringList& selectedAddresses,
                                           bool pickerIsKeyWindow) {
-    people.reset();
+    clear();
     if (personIds.isEmpty())
         return;
     const std::optional<Person> person = book.person(personIds.constFirst());
@@ -69,5 +123,5 @@ void RecipientSelection::abRecordSelected(const QList<qint64>& personIds,
 
 void RecipientSelection::textDidChange(PelmoView::Field field) {
     if (field == PelmoView::Field::To || field == PelmoView::Field::Name)
-        people.reset();
+        clear();
 }

@@ -30,9 +30,20 @@ public:
     /** The persons still to be mailed; nullopt when no group selection is pending. */
     const std::optional<QList<Person>>& getPeople() const { return people; }
     /** Makes persons the pending selection. */
-    void setPeople(const QList<Person>& persons) { people = persons; }
+    void setPeople(const QList<Person>& persons);
     /** Drops the pending selection. */
-    void clear() { people.reset(); }
+    void clear();
+    /**
+     * Puts persons in front of the pending list, in their order, starting one when none is
+     * pending; a person already pending moves to the front rather than being listed twice.
+     */
+    void putBack(const QList<Person>& persons);
+    /**
+     * What Send would mail, for the window: "Group Testers: 3 members, 1 already mailed" while
+     * a group's members are pending, "2 recipients to mail" for persons put back without one,
+     * empty when Send mails the To field.
+     */
+    QString summary() const;
     /** Takes the first pending person off the list. */
     Person takeFirst();
     /** Drops from the pending list every person whose primary address was mailed. */
@@ -61,10 +72,17 @@ public:
 Q_SIGNALS:
     /** A line for the status line and the activity log. */
     void statusMessage(const QString& text);
+    /** summary() may read differently: the pending list or the sent list changed. */
+    void summaryChanged();
 
 private:
+    void dropPeople();
+
     AddressBook& book;
     PelmoView& view;
     const SentRecipients& sent;
     std::optional<QList<Person>> people;
+    /** The group whose members are pending, and their primary addresses. */
+    QString groupName;
+    QStringList groupAddresses;
 };

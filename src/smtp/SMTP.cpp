@@ -39,7 +39,9 @@ void SMTP::trapped(Step step) {
 }
 
 void SMTP::halt(const PelmoException& failure) {
-    status(LocalizedFormat("Error (%@): %@", {failure.name(), failure.reason()}));
+    const QString text = LocalizedFormat("Error (%@): %@", {failure.name(), failure.reason()});
+    status(text);
+    failed(text);
     // Nothing the server does from now on may start a step: its signals are cut, and the
     // connection is closed at once; the session goes when it has closed.
     if (m_session) {
@@ -100,6 +102,8 @@ void SMTP::connectSession() {
     // A lost connection ends the delivery exactly as a closed one does, once its cause is shown.
     connect(session, &SmtpSession::connectionLost, this, [this] {
         reportFailureReason();
+        if (!m_succeeded)
+            failed(LocalizedStringNS("Connection lost."));
         connectionTerminated();
     });
     connect(session, &SmtpSession::connectionTimedOut, this, &SMTP::connectionTimedOut);
@@ -139,6 +143,7 @@ void SMTP::serviceInitialized() {
                             m_session->supportedMechanisms().join(QLatin1String(", ")) +
                             QLatin1Char(')')}));
     if (mechanismName(m_request.loginMechanism) == nullptr) {
+        failed(LocalizedStringNS("The login method chosen in Preferences is unknown."));
         m_state = State::Stalled;
         Q_EMIT stalled();
         return;
@@ -173,6 +178,7 @@ void SMTP::authenticationCompleted() {
 void SMTP::authenticationFailed() {
     status(LocalizedStringNS("Authentication failed. Closing the connection."));
     reportFailureReason();
+    failed(LocalizedStringNS("Authentication failed."));
     m_state = State::Closing;
     m_session->close();
 }
@@ -189,23 +195,34 @@ void SMTP::messageSent() {
 void SMTP::messageNotSent() {
     m_succeeded = false;
     const QString reply = DecodeUtf8Strictly(m_session->lastResponse());
-    if (!reply.isEmpty())
+    if (!reply.isEmpty()) {
         status(QStringLiteral("Message not sent: %1").arg(reply.trimmed()));
-    else
+        failed(reply.trimmed());
+    } else {
         reportFailureReason();
+        failed(LocalizedStringNS("The server refused the message."));
+    }
     m_state = State::Aborted;
     Q_EMIT refused();
 }
 
 void SMTP::reportFailureReason() {
-    if (m_session && !m_session->errorString().isEmpty())
+    if (m_session && !m_session->errorString().isEmpty()) {
         status(m_session->errorString());
+        failed(m_session->errorString());
+    }
+}
+
+void SMTP::failed(const QString& why) {
+    if (m_failure.isEmpty())
+        m_failure = why;
 }
 
 void SMTP::connectionTimedOut() {
     status(LocalizedStringNS("Connection lost."));
     // A refused certificate ends the session like a time-out; the user must see why.
     reportFailureReason();
+    failed(LocalizedStringNS("Connection lost."));
     end(State::TimedOut);
 }
 

@@ -50,6 +50,12 @@ public:
     State state() const { return m_state; }
     /** True once the server accepted the message. */
     bool succeeded() const { return m_succeeded; }
+    /**
+     * Why the message was not accepted, in the words shown to the user (the server's reply, the
+     * connection's error, the setting that was missing); the first cause wins. Empty while
+     * nothing has failed, and when the connection ended without a word.
+     */
+    const QString& failureReason() const { return m_failure; }
     const DeliveryRequest& request() const { return m_request; }
 
 Q_SIGNALS:
@@ -77,6 +83,8 @@ private:
     void connectionTimedOut();
     void connectionTerminated();
     void reportFailureReason();
+    /** Records why the delivery failed, unless an earlier cause is known. */
+    void failed(const QString& why);
     void halt(const PelmoException& failure);
     void end(State state);
     /** Runs step, halting on a failure. */
@@ -88,4 +96,5 @@ private:
     QPointer<SmtpSession> m_session;
     State m_state = State::Created;
     bool m_succeeded = false;
+    QString m_failure;
 };

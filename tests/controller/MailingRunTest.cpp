@@ -3,6 +3,8 @@
 
 #include "addressbook/ImportedContact.h"
 #include "controller/MessageTemplate.h"
+#include "controller/NotMailedRecipients.h"
+#include "controller/RecipientSelection.h"
 #include "controller/SentRecipients.h"
 #include "e2e/E2eSupport.h"
 
@@ -39,6 +41,17 @@ public:
         QObject::connect(&controller->sentRecipients(), &SentRecipients::rowsInserted, [this] {
             note("sent: " + controller->sentRecipients().addresses().last());
         });
+        const NotMailedRecipients& notMailed = controller->notMailedRecipients();
+        QObject::connect(&notMailed, &NotMailedRecipients::rowsInserted, [this, &notMailed] {
+            QStringList row;
+            for (int column = 0; column < NotMailedRecipients::Time; ++column)
+                row << notMailed.index(notMailed.rowCount() - 1, column).data().toString();
+            note("not mailed: " + row.join(QLatin1String(" | ")));
+        });
+        QObject::connect(&controller->selection(), &RecipientSelection::summaryChanged, [this] {
+            if (const QString now = controller->selection().summary(); now != summary)
+                note("summary: " + (summary = now));
+        });
         view.toText = QStringLiteral("ann@example.org");
         view.nameText = QStringLiteral("Ann");
         log.remove();
@@ -51,6 +64,7 @@ public:
     }
 
     Script script;
+    QString summary;
     std::unique_ptr<ServerProcess> pages; // tests/data/pages on 127.0.0.1, see page_server.py
     int pagePort = 0;
     QFile log{QStandardPaths::writableLocation(QStandardPaths::GenericDataLocation) +
@@ -91,6 +105,10 @@ const Step send = [](Run& run) {
                                                int(run.controller->currentRun()->state())));
 };
 const Step press = [](Run& run) { run.press(); };
+const Step putBack = [](Run& run) {
+    run.note(QStringLiteral("user: puts back the not mailed"));
+    run.controller->putBackNotMailed({});
+};
 // Types address into the Web Page field, "PORT" standing for the page server's.
 Step page(const QString& address) {
     return [=](Run& run) {
@@ -157,6 +175,11 @@ const Scenario kScenarios[] = {
     {"refused",
      {with<QByteArray>(&Script::refusal, "550 5.1.1 <ann@example.org>: no\r\n"), group(kClub),
       choose, send, with<QByteArray>(&Script::refusal, "550 \xff\xfe\r\n"), send}},
+    // Who was refused is listed with the reply, and put back is mailed before the rest.
+    {"put_back",
+     {with<QByteArray>(&Script::refusal, "550 5.1.1 <ann@example.org>: no\r\n"),
+      group(kClub + QStringList{"cy@example.org"}), choose, send,
+      with<QByteArray>(&Script::refusal, {}), putBack, send}},
     // A time-out stalls the run; a lost connection hands over to the next person.
     {"timeout_then_lost",
      {with(&Script::timeOutOnConnect, true), group(kClub), choose, send, press,
