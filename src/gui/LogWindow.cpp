@@ -13,6 +13,7 @@
 #include <QPushButton>
 #include <QScrollBar>
 #include <QTextCursor>
+#include <QTextDocument>
 #include <QVBoxLayout>
 
 LogWindow::LogWindow(PelmoController& controller, QWidget* parent)
@@ -47,8 +48,19 @@ LogWindow::LogWindow(PelmoController& controller, QWidget* parent)
     connect(watcher, &QFileSystemWatcher::fileChanged, this, &LogWindow::readMore);
 }
 
-void LogWindow::showLog() {
+void LogWindow::showLog(const QString& line) {
     readMore();
+    if (!line.isEmpty()) {
+        // The status line shows the latest line of the log that reads so; older ones may too.
+        QTextCursor found = m_text->document()->find(line, m_text->document()->characterCount(),
+                                                     QTextDocument::FindBackward);
+        if (!found.isNull()) {
+            found.movePosition(QTextCursor::StartOfBlock);
+            found.movePosition(QTextCursor::EndOfBlock, QTextCursor::KeepAnchor);
+            m_text->setTextCursor(found);
+            m_text->centerCursor();
+        }
+    }
     bringToFront(this);
 }
 

@@ -18,8 +18,11 @@ class LogWindow : public QWidget {
 public:
     LogWindow(PelmoController& controller, QWidget* parent);
 
-    /** Reads what the log has gained and brings the window to the front. */
-    void showLog();
+    /**
+     * Reads what the log has gained and brings the window to the front; when line is given,
+     * its latest occurrence is selected and scrolled to.
+     */
+    void showLog(const QString& line = QString());
 
 private:
     void readMore();

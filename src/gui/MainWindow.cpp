@@ -2,6 +2,7 @@
 
 #include "attachments/AttachmentsController.h"
 #include "controller/PelmoController.h"
+#include "controller/RecipientSelection.h"
 #include "gui/AlertBox.h"
 #include "gui/AttachmentsWindow.h"
 #include "gui/FormattingToolBar.h"
@@ -24,6 +25,7 @@
 #include <QLabel>
 #include <QLineEdit>
 #include <QMenuBar>
+#include <QMouseEvent>
 #include <QProgressBar>
 #include <QPushButton>
 #include <QStyle>
@@ -67,7 +69,7 @@ MainWindow::MainWindow(AddressBook& addressBook, PasswordStore& passwords, MailS
 void MainWindow::setController(PelmoController& controller) {
     m_controller = &controller;
     m_message->setDocument(controller.message());
-    m_recipients = new RecipientsWindow(controller.sentRecipients(), this);
+    m_recipients = new RecipientsWindow(controller, this);
     // The window shows the controller's own list, which every message carries as it stands.
     m_attachmentsWindow = new AttachmentsWindow(controller.getAttachments(), this);
     reportEdits(m_to, PelmoView::Field::To);
@@ -83,6 +85,22 @@ void MainWindow::setController(PelmoController& controller) {
             [this] { m_webPageButton->setEnabled(true); });
     createActions();
     connectPicker();
+    connect(&controller.selection(), &RecipientSelection::summaryChanged, m_selectionSummary,
+            [this] {
+                const QString summary = m_controller->selection().summary();
+                m_selectionSummary->setText(summary);
+                m_selectionSummary->setVisible(!summary.isEmpty());
+            });
+    // Once a run is over, halted or stopped, a bar left at 1 of 3 would tell of work going on.
+    connect(&controller, &PelmoController::runSettled, this, [this] {
+        const MailingRun::State state = m_controller->currentRun()->state();
+        if (state == MailingRun::State::Completed || state == MailingRun::State::Halted ||
+            state == MailingRun::State::Stopped) {
+            m_busy = true;
+            m_animating = false;
+            showProgress();
+        }
+    });
 }
 
 AttachmentsController& MainWindow::attachments() const {
@@ -101,7 +119,15 @@ QWidget* MainWindow::createFields() {
     auto* form = new QFormLayout(fields);
     form->setContentsMargins(0, 0, 0, 0);
     form->setFieldGrowthPolicy(QFormLayout::AllNonFixedFieldsGrow);
-    form->addRow(LocalizedStringNS("Recipient Address:"), m_to);
+    // What a chosen group means stands beside the field that shows its name.
+    m_selectionSummary = new QLabel;
+    m_selectionSummary->setObjectName(QStringLiteral("selectionSummary"));
+    m_selectionSummary->setEnabled(false);
+    m_selectionSummary->hide();
+    auto* to = new QHBoxLayout;
+    to->addWidget(m_to, 1);
+    to->addWidget(m_selectionSummary);
+    form->addRow(LocalizedStringNS("Recipient Address:"), to);
     form->addRow(LocalizedStringNS("Recipients Name:"), m_name);
     form->addRow(LocalizedStringNS("Subject:"), m_subject);
     // The button beside the field fills it from the page the browser shows.
@@ -141,7 +167,8 @@ QWidget* MainWindow::createEditor() {
 QWidget* MainWindow::createSendRow() {
     m_status = new QLabel;
     m_status->setObjectName(QStringLiteral("status"));
-    m_status->setTextInteractionFlags(Qt::TextSelectableByMouse);
+    // A click shows the line in the activity log, among those before and after it.
+    m_status->setCursor(Qt::PointingHandCursor);
     // A long status line is cut at the window's edge rather than widening the window.
     m_status->setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Preferred);
     m_status->installEventFilter(this);
@@ -183,11 +210,7 @@ void MainWindow::createActions() {
                                 LocalizedStringNS("Console"), this);
     console->setObjectName(QStringLiteral("consoleAction"));
     console->setToolTip(LocalizedStringNS("Show the activity log"));
-    connect(console, &QAction::triggered, this, [this] {
-        if (!m_logWindow)
-            m_logWindow = new LogWindow(*m_controller, this);
-        m_logWindow->showLog();
-    });
+    connect(console, &QAction::triggered, this, [this] { showLog(); });
     auto* attachments = new QAction(icon("mail-attachment", QStyle::SP_FileIcon),
                                     LocalizedStringNS("Attachments"), this);
     attachments->setObjectName(QStringLiteral("attachmentsAction"));
@@ -353,9 +376,18 @@ void MainWindow::showStatus() {
         m_status->fontMetrics().elidedText(m_statusText, Qt::ElideRight, m_status->width()));
 }
 
+void MainWindow::showLog(const QString& line) {
+    if (!m_logWindow)
+        m_logWindow = new LogWindow(*m_controller, this);
+    m_logWindow->showLog(line);
+}
+
 bool MainWindow::eventFilter(QObject* watched, QEvent* event) {
     if (watched == m_status && event->type() == QEvent::Resize)
         showStatus();
+    if (watched == m_status && event->type() == QEvent::MouseButtonRelease &&
+        static_cast<QMouseEvent*>(event)->button() == Qt::LeftButton)
+        showLog(m_statusText);
     return QMainWindow::eventFilter(watched, event);
 }
 

@@ -85,6 +85,8 @@ public:
     void showAttachments();
     /** Opens the preferences as a window-modal dialog. */
     void showPreferences();
+    /** Brings the activity log to the front, at its latest line that reads line if given. */
+    void showLog(const QString& line = QString());
 
 private:
     QWidget* createFields();
@@ -122,6 +124,7 @@ private:
     QPushButton* m_sendButton = nullptr;
     QProgressBar* m_spinner = nullptr;
     QLabel* m_status = nullptr;
+    QLabel* m_selectionSummary = nullptr;
     PeoplePicker* m_picker = nullptr;
     RecipientsWindow* m_recipients = nullptr;
     PreferencesDialog* m_preferences = nullptr;

@@ -6,6 +6,8 @@
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
 
+#include <QCollator>
+#include <QEvent>
 #include <QFileSystemWatcher>
 #include <QHBoxLayout>
 #include <QInputDialog>
@@ -18,6 +20,8 @@
 #include <QSplitter>
 #include <QTimer>
 #include <QVBoxLayout>
+
+#include <algorithm>
 
 namespace {
 
@@ -79,9 +83,10 @@ PeoplePicker::PeoplePicker(AddressBook& addressBook, QWidget* parent)
     layout->addWidget(splitter, 1);
     layout->addWidget(hint);
 
-    connect(m_groups, &QListWidget::itemSelectionChanged, this, &PeoplePicker::groupsChosen);
-    connect(m_persons, &QListWidget::itemSelectionChanged, this, &PeoplePicker::personsChosen);
-    connect(m_addresses, &QListWidget::itemSelectionChanged, this, &PeoplePicker::addressChosen);
+    for (auto [list, chosen] : {std::pair{m_groups, &PeoplePicker::groupsChosen},
+                                {m_persons, &PeoplePicker::personsChosen},
+                                {m_addresses, &PeoplePicker::addressChosen}})
+        chooseOnClick(list, chosen);
     connect(m_persons, &QListWidget::itemDoubleClicked, this, &PeoplePicker::editPerson);
     watchBook();
     reload();
@@ -173,6 +178,26 @@ qint64 PeoplePicker::shownGroup() const {
 
 // User selections
 
+// A click on the row already selected changes no selection, yet the user chose it: the choice
+// is announced again, so that it fills the recipient fields once more.
+void PeoplePicker::chooseOnClick(QListWidget* list, void (PeoplePicker::*chosen)()) {
+    connect(list, &QListWidget::itemSelectionChanged, this, [this, chosen] {
+        m_selectionChangedByPress = true;
+        (this->*chosen)();
+    });
+    connect(list, &QListWidget::itemClicked, this, [this, chosen] {
+        if (!m_selectionChangedByPress)
+            (this->*chosen)();
+    });
+    list->viewport()->installEventFilter(this);
+}
+
+bool PeoplePicker::eventFilter(QObject* watched, QEvent* event) {
+    if (event->type() == QEvent::MouseButtonPress)
+        m_selectionChangedByPress = false;
+    return QWidget::eventFilter(watched, event);
+}
+
 void PeoplePicker::groupsChosen() {
     fillPersons({});
     updateButtons();
@@ -229,22 +254,30 @@ void PeoplePicker::reload() {
 void PeoplePicker::fillGroups(const QList<qint64>& selected) {
     const QSignalBlocker blocker(m_groups);
     m_groups->clear();
-    auto* all = new QListWidgetItem(LocalizedStringNS("All"), m_groups);
+    // Nothing starts selected, so that the first click, even on "All", is a choice.
+    new QListWidgetItem(LocalizedStringNS("All"), m_groups);
     for (const Group& group : m_book.groups()) {
         auto* item = new QListWidgetItem(group.name, m_groups);
         item->setData(kIdRole, group.id);
         item->setSelected(selected.contains(group.id));
     }
-    if (m_groups->selectedItems().isEmpty())
-        all->setSelected(true);
 }
 
 void PeoplePicker::fillPersons(const QList<qint64>& selected) {
     const QSignalBlocker blocker(m_persons);
     m_persons->clear();
     const qint64 group = shownGroup();
-    const QList<Person> persons =
+    QList<Person> persons =
         group == 0 ? m_book.persons() : m_book.members(group).value_or(QList<Person>());
+    // A group's members in the order of the whole book, though they are mailed in the group's.
+    QCollator collator;
+    collator.setCaseSensitivity(Qt::CaseInsensitive);
+    std::stable_sort(persons.begin(), persons.end(),
+                     [&collator](const Person& one, const Person& other) {
+                         if (const int last = collator.compare(one.lastName, other.lastName))
+                             return last < 0;
+                         return collator.compare(one.firstName, other.firstName) < 0;
+                     });
     for (const Person& person : persons) {
         auto* item = new QListWidgetItem(shownName(person), m_persons);
         item->setData(kIdRole, person.id);

@@ -47,8 +47,12 @@ Q_SIGNALS:
     void displayedPropertyChanged(const QList<qint64>& personIds,
                                   const QStringList& selectedAddresses, bool pickerIsKeyWindow);
 
+protected:
+    bool eventFilter(QObject* watched, QEvent* event) override;
+
 private:
     void watchBook();
+    void chooseOnClick(QListWidget* list, void (PeoplePicker::*chosen)());
     QWidget* createColumn(const char* title, QListWidget* list, QList<QWidget*> buttons);
     QWidget* createGroupColumn();
     QWidget* createPersonColumn();
@@ -91,4 +95,6 @@ private:
     QPushButton* m_editPerson = nullptr;
     QPushButton* m_deletePerson = nullptr;
     QPushButton* m_groupsOfPerson = nullptr;
+    /** Whether the latest mouse press in a list changed its selection. */
+    bool m_selectionChangedByPress = false;
 };

@@ -2,23 +2,29 @@
 
 #include <QWidget>
 
+class PelmoController;
 class QTableView;
-class SentRecipients;
 
 /**
- * The "sent recipients" window: every address mailed since Pelmo started, numbered, and a
- * Reset button that forgets them. It shows the controller's list model as it changes, scrolled
- * to the latest address. A separate window owned by its parent (the main window); the list
- * is not owned and must outlive it.
+ * The "sent recipients" window: every address mailed since Pelmo started, numbered, with a
+ * Reset button that forgets them; below it, the group members whose copy was not accepted,
+ * with why and when, and a Put Back button that queues them before the members still pending.
+ * It shows the controller's models as they change. A separate window owned by its parent (the
+ * main window); the controller is not owned and must outlive it.
  */
 class RecipientsWindow : public QWidget {
     Q_OBJECT
 
 public:
-    RecipientsWindow(SentRecipients& recipients, QWidget* parent);
+    RecipientsWindow(PelmoController& controller, QWidget* parent);
 
     QTableView& table() const { return *m_table; }
+    QTableView& notMailedTable() const { return *m_notMailed; }
 
 private:
+    QWidget* createSentPane(PelmoController& controller);
+    QWidget* createNotMailedPane(PelmoController& controller);
+
     QTableView* m_table;
+    QTableView* m_notMailed;
 };

@@ -12,6 +12,7 @@
 #include <QPlainTextEdit>
 #include <QProgressBar>
 #include <QTableView>
+#include <QTcpServer>
 #include <QTextEdit>
 
 namespace {
@@ -50,6 +51,16 @@ protected:
         return text;
     }
     QString status() const { return child<QLabel>("status")->text(); }
+    // A port of 127.0.0.1 that nobody listens on, the same one each time.
+    int closedPort() {
+        if (!m_closedPort) {
+            QTcpServer listener;
+            listener.listen(QHostAddress::LocalHost);
+            m_closedPort = listener.serverPort();
+        }
+        return m_closedPort;
+    }
+    int m_closedPort = 0;
     // Answers the question on the window (Cancel being its default) with the button named so.
     void answer(const QString& question, const QString& button) {
         auto* box = asked<QMessageBox>();
@@ -101,10 +112,32 @@ TEST_F(WindowRun, SendMailsTheTypedRecipientThenAGroup) {
     clickRow(child<QListWidget>("groups", &picker()), "Club");
     press(false);
     EXPECT_EQ(shown(), "Stop 1 of 3 /");
-    press(); // Stop while Ann's copy is on its way
-    EXPECT_EQ(shown(), "Send 1 of 3 / 1 ann@example.org");
+    press(); // Stop while Ann's copy is on its way: the bar goes idle
+    EXPECT_EQ(shown(), "Send -1 of 1 / 1 ann@example.org");
     press(); // goes on with those not yet mailed
     EXPECT_EQ(shown(), "Send -1 of 1 / 1 ann@example.org 2 bob@example.org 3 cy@example.org");
+
+    // Nobody listens on the port: the run waits on Ann with Stop showing; after Stop she is
+    // listed as not mailed with why, and Put Back mails her first at the next Send. Club, still
+    // highlighted in the picker, is chosen by a click all the same.
+    pelmo->resetRecipients();
+    set("serverPort", closedPort());
+    clickRow(child<QListWidget>("groups", &picker()), "Club");
+    EXPECT_EQ(child<QLabel>("selectionSummary")->text(), "Group Club: 3 members, 0 already mailed");
+    press();
+    press();
+    const QAbstractItemModel* notMailed = window->recipientsWindow().notMailedTable().model();
+    EXPECT_EQ(notMailed->index(0, 1).data().toString() + " / " +
+                  notMailed->index(0, 2).data().toString(),
+              QString("ann@example.org / Could not connect to 127.0.0.1:%1: Connection refused")
+                  .arg(closedPort()));
+    EXPECT_EQ(shown(), "Send -1 of 1 /");
+    set("serverPort", server.port());
+    QTest::mouseClick(child<QPushButton>("putBackButton", &window->recipientsWindow()),
+                      Qt::LeftButton);
+    press();
+    EXPECT_EQ(shown(), "Send -1 of 1 / 1 ann@example.org 2 bob@example.org 3 cy@example.org");
+    EXPECT_EQ(notMailed->rowCount(), 0);
 
     // A group's name left in To is no address: an alert, and no connection.
     child<QLineEdit>("to")->setText("Club");
@@ -112,7 +145,7 @@ TEST_F(WindowRun, SendMailsTheTypedRecipientThenAGroup) {
     ASSERT_NE(asked<QMessageBox>(), nullptr);
     EXPECT_EQ(asked<QMessageBox>()->text(), "The recipient address is not an e-mail address");
     asked<QMessageBox>()->accept();
-    EXPECT_EQ(server.records().size(), 4);
+    EXPECT_EQ(server.records().size(), 7);
 }
 
 // Quitting with unsent text asks first; a long status line ends in "…" with the whole of it in
@@ -126,6 +159,12 @@ TEST_F(WindowRun, QuitAsksForUnsentTextLongStatusElidedLogWindowFollows) {
     pelmo->statusMsg("Written after the window opened");
     EXPECT_TRUE(waitUntil(
         [log] { return log->toPlainText().contains("\nWritten after the window opened\n"); }));
+    // A click on the status line selects its latest occurrence in the log.
+    for (const char* line : {"Sending mail.", "Other", "Sending mail."})
+        pelmo->statusMsg(line);
+    QTest::mouseClick(child<QLabel>("status"), Qt::LeftButton);
+    EXPECT_EQ(log->textCursor().selectedText(), "Sending mail.");
+    EXPECT_GT(log->textCursor().blockNumber(), log->document()->find("Other").blockNumber());
     pelmo->applicationWillTerminate();
     const QString longText = QString("Error (NoServer): ") + QString(300, 'x');
     window->setStatus(longText);
