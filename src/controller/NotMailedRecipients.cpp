@@ -3,6 +3,8 @@
 #include "util/LocalizedStrings.h"
 #include "util/TextUtilities.h"
 
+#include <QLocale>
+
 #include <algorithm>
 
 void NotMailedRecipients::addPerson(const Person& person, const QString& reason) {
@@ -62,8 +64,8 @@ QVariant NotMailedRecipients::data(const QModelIndex& index, int role) const {
     if (!checkIndex(index, CheckIndexOption::IndexIsValid))
         return {};
     const Entry& entry = entries.at(index.row());
-    if (role == Qt::ToolTipRole && index.column() == Reason)
-        return entry.reason;
+    if (role == Qt::ToolTipRole)
+        return index.column() == Time ? DateDescription(entry.time) : entry.reason;
     if (role != Qt::DisplayRole)
         return {};
     switch (index.column()) {
@@ -74,7 +76,8 @@ QVariant NotMailedRecipients::data(const QModelIndex& index, int role) const {
     case Reason:
         return entry.reason;
     default:
-        return DateDescription(entry.time);
+        // The day is in the tooltip: a run rarely outlasts it.
+        return QLocale().toString(entry.time.time(), QLocale::ShortFormat);
     }
 }
 

@@ -122,7 +122,6 @@ QWidget* MainWindow::createFields() {
     // What a chosen group means stands beside the field that shows its name.
     m_selectionSummary = new QLabel;
     m_selectionSummary->setObjectName(QStringLiteral("selectionSummary"));
-    m_selectionSummary->setEnabled(false);
     m_selectionSummary->hide();
     auto* to = new QHBoxLayout;
     to->addWidget(m_to, 1);

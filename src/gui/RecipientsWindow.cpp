@@ -59,7 +59,7 @@ RecipientsWindow::RecipientsWindow(PelmoController& controller, QWidget* parent)
     splitter->addWidget(createNotMailedPane(controller));
     auto* layout = new QVBoxLayout(this);
     layout->addWidget(splitter);
-    resize(620, 520);
+    resize(760, 520);
 }
 
 QWidget* RecipientsWindow::createSentPane(PelmoController& controller) {
@@ -88,9 +88,15 @@ QWidget* RecipientsWindow::createNotMailedPane(PelmoController& controller) {
     NotMailedRecipients& notMailed = controller.notMailedRecipients();
     m_notMailed = tableOf("notMailedTableView", &notMailed);
     m_notMailed->verticalHeader()->hide();
-    m_notMailed->horizontalHeader()->setSectionResizeMode(NotMailedRecipients::Reason,
-                                                          QHeaderView::Stretch);
-    m_notMailed->horizontalHeader()->setStretchLastSection(false);
+    // The reason takes what the name, the address and the time leave.
+    QHeaderView* header = m_notMailed->horizontalHeader();
+    header->setSectionResizeMode(NotMailedRecipients::Reason, QHeaderView::Stretch);
+    header->setStretchLastSection(false);
+    connect(&notMailed, &QAbstractItemModel::rowsInserted, m_notMailed, [this] {
+        for (const int column :
+             {NotMailedRecipients::Name, NotMailedRecipients::Address, NotMailedRecipients::Time})
+            m_notMailed->resizeColumnToContents(column);
+    });
     auto* putBack = new QPushButton(LocalizedStringNS("Put Back"));
     putBack->setObjectName(QStringLiteral("putBackButton"));
     putBack->setToolTip(LocalizedStringNS("Mail the selected persons, or all of them when none "
