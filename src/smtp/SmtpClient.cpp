@@ -262,6 +262,16 @@ void SmtpClient::sendMessage() {
         command += " SIZE=" + QByteArray::number(m_message.size());
     if (!firstUtf8Path(m_sender, m_recipients).isNull()) // RFC 6531 3.4
         command += " SMTPUTF8";
+    m_nextRecipient = 0;
+    m_refusal.reset();
+    // RFC 2920 3.1: DATA may end a group, so the whole envelope is one round trip.
+    m_pipelined = m_capabilities.pipelining;
+    if (m_pipelined) {
+        command += "\r\n";
+        for (const QString& recipient : std::as_const(m_recipients))
+            command += "RCPT TO:<" + envelopePath(recipient) + ">\r\n";
+        command += "DATA";
+    }
     send(command);
     enter(State::MailFrom);
 }
@@ -624,16 +634,27 @@ void SmtpClient::refuseBeforeSending(const QString& why) {
 }
 
 void SmtpClient::refuseMessage() {
+    m_pipelined = false;
     m_errorString = tr("The server %1 refused the message: %2").arg(m_host, replyText());
     enter(State::Ready);
     notify(&SmtpSession::messageNotSent);
 }
 
 void SmtpClient::onMailFrom(int code) {
+    if (m_pipelined)
+        return onPipelinedReply(code, State::RcptTo);
     if (!isPositive(code))
         return refuseMessage();
-    m_nextRecipient = 0;
     sendNextRecipient();
+}
+
+// RFC 2920 3.2: every command of the group gets its reply, in order, whatever came before.
+void SmtpClient::onPipelinedReply(int code, State next) {
+    if (!isPositive(code) && !m_refusal)
+        m_refusal = m_reply;
+    if (next == State::RcptTo && ++m_nextRecipient > m_recipients.size())
+        next = State::Data;
+    enter(next);
 }
 
 void SmtpClient::sendNextRecipient() {
@@ -644,6 +665,8 @@ void SmtpClient::sendNextRecipient() {
 // A refused recipient stops the whole transaction: a personalised copy goes to all its
 // recipients or to none.
 void SmtpClient::onRcptTo(int code) {
+    if (m_pipelined)
+        return onPipelinedReply(code, State::RcptTo);
     if (!isPositive(code))
         return refuseMessage();
     if (m_nextRecipient < m_recipients.size())
@@ -653,6 +676,15 @@ void SmtpClient::onRcptTo(int code) {
 }
 
 void SmtpClient::onData(int code) {
+    if (m_refusal) {
+        m_reply = *m_refusal;
+        // A server that wants the message after refusing part of the envelope would deliver
+        // it to some recipients only; leaving mid-transaction makes it drop the message.
+        if (code == 354)
+            return finish(&SmtpSession::connectionLost,
+                          tr("The server %1 refused the message: %2").arg(m_host, replyText()));
+        return refuseMessage();
+    }
     if (code != 354)
         return refuseMessage();
     m_socket->write(dataBlock(m_message));
@@ -660,6 +692,7 @@ void SmtpClient::onData(int code) {
 }
 
 void SmtpClient::onDataEnd(int code) {
+    m_pipelined = false;
     if (!isPositive(code))
         return refuseMessage();
     enter(State::Ready);

@@ -11,6 +11,7 @@
 #include <QTimer>
 
 #include <chrono>
+#include <optional>
 
 class QSslSocket;
 
@@ -36,7 +37,9 @@ class QSslSocket;
  * the certificates of SSL_CERT_FILE / SSL_CERT_DIR when set, and against the host name.
  *
  * A refused MAIL, RCPT (any one recipient), DATA or end of data is messageNotSent with the
- * refusal in lastResponse(); the session stays open for close(). What is refused before
+ * refusal in lastResponse(); the session stays open for close(). When the server offers
+ * PIPELINING (RFC 2920), MAIL, every RCPT and DATA go in one write and their replies are read
+ * in order; the first refusal among them is the one reported. What is refused before
  * anything is sent (a CR, LF or NUL in a credential, a control character or angle bracket in
  * an address, a message above the server's SIZE, an unknown mechanism) is authenticationFailed
  * or messageNotSent with lastResponse() empty, as no reply belongs to it. errorString() gives
@@ -144,6 +147,7 @@ private:
     void refuseBeforeSending(const QString& why);
     void refuseMessage();
     void onMailFrom(int code);
+    void onPipelinedReply(int code, State next);
     void sendNextRecipient();
     void onRcptTo(int code);
     void onData(int code);
@@ -175,4 +179,8 @@ private:
     QString m_sender;
     QStringList m_recipients;
     qsizetype m_nextRecipient = 0;
+    /** The envelope went in one write: replies are read without answering each. */
+    bool m_pipelined = false;
+    /** The first refusal among pipelined replies, reported once DATA's reply is in. */
+    std::optional<SmtpReply> m_refusal;
 };

@@ -96,6 +96,8 @@ SmtpCapabilities SmtpCapabilities::fromEhlo(const SmtpReply& reply) {
             capabilities.sizeLimit = words.size() > 1 ? std::max(words[1].toLongLong(), 0LL) : 0;
         } else if (words[0] == QLatin1String("SMTPUTF8")) {
             capabilities.smtpUtf8 = true;
+        } else if (words[0] == QLatin1String("PIPELINING")) {
+            capabilities.pipelining = true;
         }
     }
     return capabilities;

@@ -60,6 +60,7 @@ struct SmtpCapabilities {
     bool size = false;      ///< SIZE (RFC 1870)
     qint64 sizeLimit = 0;   ///< SIZE's limit in bytes; 0 for none
     bool smtpUtf8 = false;  ///< SMTPUTF8 (RFC 6531 3.2): addresses may be UTF-8
+    bool pipelining = false; ///< PIPELINING (RFC 2920): commands may go without waiting
 
     static SmtpCapabilities fromEhlo(const SmtpReply& reply);
 };
