@@ -4,9 +4,9 @@
 // person on a list 50 times shorter.
 
 #include "addressbook/AddressBook.h"
-#include "controller/PasswordStore.h"
-#include "controller/PelmoController.h"
 #include "controller/PelmoView.h"
+#include "controller/RecipientSelection.h"
+#include "controller/SentRecipients.h"
 
 #include <QGuiApplication>
 #include <QSet>
@@ -43,7 +43,6 @@ public:
     QString sendButtonTitle() const override { return {}; }
     void setSendButtonTitle(const QString&) override {}
     void showRecipientsWindow() override {}
-    void reloadRecipients() override {}
     void alert(const QString&, const QString&) override {}
     void beep() override {}
 };
@@ -72,15 +71,15 @@ Lists makeLists(int n) {
 struct Fixture {
     QTemporaryDir folder;
     SilentView view;
-    PasswordStore passwords;
+    SentRecipients sent;
     std::unique_ptr<AddressBook> book;
-    std::unique_ptr<PelmoController> controller;
+    std::unique_ptr<RecipientSelection> selection;
 
-    explicit Fixture(const QStringList& sent) {
+    explicit Fixture(const QStringList& addresses) {
         book = std::make_unique<AddressBook>(folder.filePath(QStringLiteral("book.sqlite")));
-        controller = std::make_unique<PelmoController>(view, *book, passwords);
-        for (const QString& address : sent)
-            controller->addRecipient(address);
+        selection = std::make_unique<RecipientSelection>(*book, view, sent);
+        for (const QString& address : addresses)
+            sent.addRecipient(address);
     }
 };
 
@@ -89,9 +88,9 @@ void FilterPeopleByRecipients(benchmark::State& state) {
     Fixture fixture(lists.sent);
     qsizetype kept = 0;
     for (auto _ : state) {
-        fixture.controller->setPeople(lists.persons);
-        fixture.controller->filterPeopleByRecipients();
-        kept = fixture.controller->getPeople()->size();
+        fixture.selection->setPeople(lists.persons);
+        fixture.selection->filterPeopleByRecipients();
+        kept = fixture.selection->getPeople()->size();
     }
     state.counters["kept"] = static_cast<double>(kept);
 }
