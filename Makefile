@@ -8,7 +8,7 @@ PREFIX ?= /usr/local
 JOBS ?= 2
 FUZZ_SECONDS ?= 60
 
-.PHONY: all deps run install test bench fuzz mutants clean
+.PHONY: all deps run install deb test bench fuzz mutants clean
 
 all: test
 
@@ -21,12 +21,19 @@ run: deps
 	cmake --build $(BUILD_RUN) -j $(JOBS) --target pelmo
 	$(BUILD_RUN)/src/pelmo
 
-# Builds Pelmo optimised and installs the program, its desktop entry and its icon under
-# $(PREFIX); DESTDIR=DIR stages them in DIR instead.
+# Builds Pelmo optimised and installs the program, its desktop entry, metainfo, icons, manual
+# page and README under $(PREFIX); DESTDIR=DIR stages them in DIR instead.
 install: deps
 	cmake -S . -B $(BUILD_RELEASE) -G Ninja -DCMAKE_BUILD_TYPE=Release -DPELMO_BUILD_TESTS=OFF
-	cmake --build $(BUILD_RELEASE) -j $(JOBS) --target pelmo
+	cmake --build $(BUILD_RELEASE) -j $(JOBS)
 	cmake --install $(BUILD_RELEASE) --prefix $(PREFIX)
+
+# Builds Pelmo optimised and packages it as $(BUILD_RELEASE)/pelmo_<version>_amd64.deb, installed
+# under /usr, its dependencies worked out by dpkg-shlibdeps.
+deb: deps
+	cmake -S . -B $(BUILD_RELEASE) -G Ninja -DCMAKE_BUILD_TYPE=Release -DPELMO_BUILD_TESTS=OFF
+	cmake --build $(BUILD_RELEASE) -j $(JOBS)
+	cd $(BUILD_RELEASE) && cpack -G DEB
 
 # The test build runs under AddressSanitizer and UndefinedBehaviorSanitizer.
 test: deps

@@ -14,6 +14,7 @@ packages=(
   postfix
   libxcb1-dev xvfb
   xdg-utils desktop-file-utils
+  librsvg2-bin appstream dpkg-dev lintian
 )
 
 missing=()

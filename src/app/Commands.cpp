@@ -57,7 +57,7 @@ int run(const QStringList& args) {
         return 0;
     }
     if (args.size() == 1 && args.first() == QLatin1String("--version")) {
-        QTextStream(stdout) << "pelmo " << QCoreApplication::applicationVersion() << '\n';
+        QTextStream(stdout) << "Pelmo " << QCoreApplication::applicationVersion() << '\n';
         return 0;
     }
     if (!args.isEmpty()) {

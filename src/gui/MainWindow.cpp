@@ -3,9 +3,11 @@
 #include "attachments/AttachmentsController.h"
 #include "controller/PelmoController.h"
 #include "controller/RecipientSelection.h"
+#include "gui/AboutDialog.h"
 #include "gui/AlertBox.h"
 #include "gui/AttachmentsWindow.h"
 #include "gui/FormattingToolBar.h"
+#include "gui/HelpPage.h"
 #include "gui/LogWindow.h"
 #include "gui/PeoplePicker.h"
 #include "gui/PreferencesDialog.h"
@@ -248,9 +250,15 @@ void MainWindow::createActions() {
     menuBar()->addMenu(LocalizedStringNS("&Message"))->addAction(send);
     QMenu* window = menuBar()->addMenu(LocalizedStringNS("&Window"));
     window->addActions({addresses, attachments, recipients, console});
-    menuBar()
-        ->addMenu(LocalizedStringNS("&Help"))
-        ->addAction(LocalizedStringNS("About Qt"), qApp, &QApplication::aboutQt);
+    QMenu* help = menuBar()->addMenu(LocalizedStringNS("&Help"));
+    QAction* helpPage =
+        help->addAction(LocalizedStringNS("Pelmo Help"), this, [this] { openHelp(this); });
+    helpPage->setObjectName(QStringLiteral("helpAction"));
+    helpPage->setShortcut(QKeySequence::HelpContents);
+    help->addAction(LocalizedStringNS("About Pelmo"), this,
+                    [this] { (new AboutDialog(this))->open(); })
+        ->setObjectName(QStringLiteral("aboutAction"));
+    help->addAction(LocalizedStringNS("About Qt"), qApp, &QApplication::aboutQt);
     for (QWidget* tool :
          {static_cast<QWidget*>(m_picker), static_cast<QWidget*>(m_attachmentsWindow),
           static_cast<QWidget*>(m_recipients)})
