@@ -1,12 +1,15 @@
 #!/usr/bin/env bash
-# A whole mailing run against Postfix's smtp-sink on 127.0.0.1: 500 copies of a 20 KB message
-# sent by `pelmo send --group`, and the same by smtp-source with one connection per message,
-# the protocol's floor. Prints both times and their ratio.
-# Usage: bench-send.sh PATH-TO-PELMO [COPIES]
+# Whole mailing runs against Postfix's smtp-sink on 127.0.0.1: COPIES copies of a 20 KB message
+# sent by `pelmo send --group`, as plain text and as rich text (HTML), and the same number of
+# 20 KB messages sent by smtp-source with one connection per message, the protocol's floor.
+# The three runs are interleaved ROUNDS times; the medians per copy and their ratios are
+# printed.
+# Usage: bench-send.sh PATH-TO-PELMO [COPIES] [ROUNDS]
 set -euo pipefail
 
 pelmo=$(realpath "$1")
-copies=${2:-500}
+copies=${2:-300}
+rounds=${3:-5}
 work=$(mktemp -d)
 sink=""
 cleanup() { [ -n "$sink" ] && kill "$sink" 2>/dev/null; rm -rf "$work"; }
@@ -19,7 +22,8 @@ as_user=()
 /usr/sbin/smtp-sink "${as_user[@]}" 127.0.0.1:"$port" 256 &
 sink=$!
 
-export XDG_DATA_HOME="$work/data" XDG_CONFIG_HOME="$work/config"
+export XDG_DATA_HOME="$work/data" XDG_CONFIG_HOME="$work/config" XDG_RUNTIME_DIR="$work/run"
+mkdir -m 700 "$work/run"
 python3 - "$copies" > "$work/people.csv" <<'PY'
 import sys
 print("first name,last name,e-mail,groups")
@@ -28,24 +32,50 @@ for i in range(int(sys.argv[1])):
 PY
 "$pelmo" contacts import "$work/people.csv" > /dev/null
 python3 -c 'print(("Dear {toName}, " + "x" * 70 + "\n") * 240, end="")' > "$work/message.txt"
+python3 -c 'print("<html><body>" + ("<p>Dear <b>{toName}</b>, " + "x" * 60 + "</p>\n") * 240 + "</body></html>")' \
+  > "$work/message.html"
 
-now() { date +%s.%N; }
-start=$(now)
-"$pelmo" send --group Bench --subject "Bench for {toName}" --message "$work/message.txt" \
-  --set serverAddress=127.0.0.1 --set serverPort="$port" --set senderEmail=bench@example.org \
-  --set senderName=Bench --set selectedContentType=1 --set selectedAuthentication=0 --set useSSL=false \
-  > "$work/pelmo.out"
-middle=$(now)
-/usr/sbin/smtp-source -s 1 -m "$copies" -l 20480 -f bench@example.org -t reader@example.org 127.0.0.1:"$port"
-end=$(now)
+# pelmo FORMAT MESSAGE-FILE: one run over the group; the time goes to standard output.
+run_pelmo() {
+  local start end sent
+  start=$(date +%s.%N)
+  "$pelmo" send --group Bench --subject "Bench for {toName}" --message "$work/$2" \
+    --set serverAddress=127.0.0.1 --set serverPort="$port" --set senderEmail=bench@example.org \
+    --set senderName=Bench --set selectedContentType="$1" --set selectedAuthentication=0 \
+    --set useSSL=false > "$work/pelmo.out"
+  end=$(date +%s.%N)
+  sent=$(grep -c '^Message sent. Closing the connection.$' "$work/pelmo.out" || true)
+  [ "$sent" -eq "$copies" ] || { echo "bench-send: pelmo sent $sent of $copies copies" >&2; exit 1; }
+  python3 -c "print($end - $start)"
+}
 
-sent=$(grep -c '^Message sent. Closing the connection.$' "$work/pelmo.out" || true)
-[ "$sent" -eq "$copies" ] || { echo "bench-send: pelmo sent $sent of $copies copies" >&2; exit 1; }
-python3 - "$start" "$middle" "$end" "$copies" <<'PY'
-import sys
-start, middle, end = (float(v) for v in sys.argv[1:4])
-copies = int(sys.argv[4])
-pelmo, source = middle - start, end - middle
-print(f"mailing run, {copies} copies of 20 KB through smtp-sink: pelmo send {pelmo:.2f} s, "
-      f"smtp-source {source:.2f} s, ratio {pelmo / source:.2f}")
+run_source() {
+  local start end
+  start=$(date +%s.%N)
+  /usr/sbin/smtp-source -s 1 -m "$copies" -l 20480 -f bench@example.org -t reader@example.org \
+    127.0.0.1:"$port"
+  end=$(date +%s.%N)
+  python3 -c "print($end - $start)"
+}
+
+: > "$work/times"
+for _ in $(seq "$rounds"); do
+  echo "plain $(run_pelmo 1 message.txt)" >> "$work/times"
+  echo "rich $(run_pelmo 0 message.html)" >> "$work/times"
+  echo "source $(run_source)" >> "$work/times"
+done
+python3 - "$work/times" "$copies" <<'PY'
+import statistics, sys
+times = {}
+for line in open(sys.argv[1]):
+    kind, seconds = line.split()
+    times.setdefault(kind, []).append(float(seconds))
+copies = int(sys.argv[2])
+per = {kind: statistics.median(values) / copies * 1000 for kind, values in times.items()}
+print(f"mailing run, {copies} copies of 20 KB through smtp-sink, medians of {len(times['source'])} "
+      f"interleaved rounds, per copy (whole process):")
+for kind in ("plain", "rich"):
+    print(f"  pelmo send, {kind} text: {per[kind]:.2f} ms, ratio to smtp-source "
+          f"{per[kind] / per['source']:.2f}")
+print(f"  smtp-source: {per['source']:.2f} ms")
 PY

@@ -3,6 +3,8 @@
 #include <QObject>
 #include <QString>
 
+#include <optional>
+
 class MailSettings;
 class PelmoView;
 class QTextDocument;
@@ -60,5 +62,9 @@ private:
     QTextDocument* document;
     /** The body as plain text, null until asked for after a change. */
     QString plainBody;
+    /** The body as HTML in the set htmlCharset, null when the export failed; unset until
+     * asked for after a change. Copies differ only by their tags, so it is made once a run. */
+    std::optional<QString> htmlBody;
+    int htmlCharset = -1;
     QString webPageOrFileContents;
 };

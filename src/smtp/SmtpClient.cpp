@@ -28,16 +28,21 @@ bool isPositive(int code) {
 QByteArray normalizeLineEnds(const QByteArray& message) {
     QByteArray out;
     out.reserve(message.size() + 2);
-    for (qsizetype i = 0; i < message.size(); ++i) {
-        const char c = message[i];
-        if (c == '\r' || c == '\n') {
-            out += "\r\n";
-            if (c == '\r' && i + 1 < message.size() && message[i + 1] == '\n')
-                ++i;
-        } else {
-            out += c;
-        }
+    const QByteArrayView text(message);
+    qsizetype done = 0;
+    // Runs between line ends are copied whole: a message is mostly text, and its line ends
+    // are already CRLF when it comes from the assembly.
+    for (qsizetype cr = text.indexOf('\r'), lf = text.indexOf('\n'); cr >= 0 || lf >= 0;) {
+        const qsizetype at = cr < 0 ? lf : lf < 0 ? cr : std::min(cr, lf);
+        out.append(text.sliced(done, at - done));
+        out.append("\r\n", 2);
+        done = at + (at == cr && lf == at + 1 ? 2 : 1);
+        if (cr >= 0 && cr < done)
+            cr = text.indexOf('\r', done);
+        if (lf >= 0 && lf < done)
+            lf = text.indexOf('\n', done);
     }
+    out.append(text.sliced(done));
     if (!out.isEmpty() && !out.endsWith("\r\n"))
         out += "\r\n";
     return out;
