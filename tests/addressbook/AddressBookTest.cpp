@@ -94,11 +94,16 @@ TEST_P(Import, Case) {
     QStringList lines;
     try {
         const QString& kind = GetParam().kind;
-        for (const auto& [person, groups] :
-             kind == "vcard" ? VCardImporter::parse(input)
-             : kind == "csv" ? CsvImporter::parse(input)
-                             : ContactsFile::read(PELMO_TEST_DATA "/import/" + input.trimmed()))
+        const ParsedContacts parsed =
+            kind == "vcard" ? VCardImporter::parse(input)
+            : kind == "csv" ? CsvImporter::parse(input)
+                            : ContactsFile::read(PELMO_TEST_DATA "/import/" + input.trimmed());
+        for (const auto& [person, groups] : parsed.contacts)
             lines << contactLine(person, groups);
+        for (const SkippedValue& skipped : parsed.skipped)
+            lines << QStringLiteral("skipped %1: %2").arg(skipped.line).arg(skipped.reason);
+        if (parsed.contactsSkipped > 0)
+            lines << QStringLiteral("%1 left out").arg(parsed.contactsSkipped);
     } catch (const ImportError& error) {
         EXPECT_EQ(error.name(), "MalformedContactsFile");
         lines << QStringLiteral("error %1: %2").arg(error.line()).arg(error.reason());
@@ -177,15 +182,24 @@ QString apply(AddressBook& book, const QStringList& words) {
         AddressBook elsewhere(book.path());
         return apply(elsewhere, words.mid(1));
     }
-    if (op == "import") {
+    if (op == "import" || op == "importfile") {
         QList<ImportedContact> contacts;
         for (const QString& line : words.mid(1))
             contacts << contactOf(line);
-        const ImportSummary summary = book.add(contacts);
-        return QStringLiteral("%1 added, %2 known, %3 groups")
+        const ImportSummary summary = op == "import" ? book.add(contacts) : book.importFile(path);
+        return QStringLiteral("%1 added, %2 updated, %3 unchanged, %4 new groups")
             .arg(summary.personsAdded)
-            .arg(summary.personsKnown)
-            .arg(summary.groups);
+            .arg(summary.personsUpdated)
+            .arg(summary.personsUnchanged)
+            .arg(summary.groupsAdded);
+    }
+    if (op == "export")
+        return QString::number(book.exportFile(path, words.size() > 2 ? words[2] : QString()));
+    if (op == "dump")
+        return dump(book);
+    if (op == "into") { // on another book in the folder
+        AddressBook another(path);
+        return apply(another, words.mid(2));
     }
     if (op == "sql") { // straight to the file, past the book
         {

@@ -1,0 +1,24 @@
+#pragma once
+
+#include "addressbook/SkippedValue.h"
+
+#include <QList>
+
+/** What one import did to the address book. */
+struct ImportSummary {
+    /** Persons new to the book. */
+    int personsAdded = 0;
+    /**
+     * Persons already in the book (the same primary address) who gained an address, a name
+     * part or a group from the file.
+     */
+    int personsUpdated = 0;
+    /** Persons already in the book to whom the file added nothing. */
+    int personsUnchanged = 0;
+    /** Contacts of the file left out whole because of a fault. */
+    int personsSkipped = 0;
+    /** Groups the import created. */
+    int groupsAdded = 0;
+    /** Every value left out, in the order of the file. */
+    QList<SkippedValue> skipped;
+};
