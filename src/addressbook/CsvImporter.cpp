@@ -197,40 +197,39 @@ struct KnownColumn {
 };
 
 constexpr KnownColumn kKnownColumns[] = {
-    {"first name", Column::FirstName},     // Thunderbird, Outlook, our own
-    {"given name", Column::FirstName},     // Google
-    {"forename", Column::FirstName},       //
-    {"vorname", Column::FirstName},        // German Outlook
-    {"last name", Column::LastName},       // Thunderbird, Outlook, our own
-    {"family name", Column::LastName},     // Google
-    {"surname", Column::LastName},         //
+    {"first name", Column::FirstName}, // Thunderbird, Outlook, our own
+    {"given name", Column::FirstName}, // Google
+    {"forename", Column::FirstName},
+    {"vorname", Column::FirstName},    // German Outlook
+    {"last name", Column::LastName},   // Thunderbird, Outlook, our own
+    {"family name", Column::LastName}, // Google
+    {"surname", Column::LastName},
     {"nachname", Column::LastName},        // German Outlook
     {"display name", Column::DisplayName}, // Thunderbird
     {"name", Column::DisplayName},         // Google
-    {"full name", Column::DisplayName},    //
-    {"anzeigename", Column::DisplayName},  // German Thunderbird
-    {"e-mail", Column::Email},             // our own
-    {"email address", Column::Email},      //
-    {"email addresses", Column::Email},    //
-    {"primary email", Column::Email},      // Thunderbird
-    {"secondary email", Column::Email},    //
-    {"e-mail address", Column::Email},     // Outlook
-    {"e-mail 2 address", Column::Email},   //
-    {"e-mail 3 address", Column::Email},   //
-    {"e-mail-adresse", Column::Email},     // German Outlook
-    {"e-mail 2: adresse", Column::Email},  //
-    {"e-mail 3: adresse", Column::Email},  //
-    {"e-mail 1 - value", Column::Email},   // Google
-    {"e-mail 2 - value", Column::Email},   //
-    {"e-mail 3 - value", Column::Email},   //
-    {"e-mail 4 - value", Column::Email},   //
-    {"email home", Column::Email},         // address books of mobile phones
-    {"email work", Column::Email},         //
-    {"groups", Column::Groups},            // our own
-    {"group", Column::Groups},             //
-    {"categories", Column::Groups},        // Outlook
-    {"kategorien", Column::Groups},        // German Outlook
-    {"group membership", Column::Groups},  // Google
+    {"full name", Column::DisplayName},
+    {"anzeigename", Column::DisplayName}, // German Thunderbird
+    {"e-mail", Column::Email},            // our own
+    {"email addresses", Column::Email},
+    {"primary email", Column::Email}, // Thunderbird
+    {"secondary email", Column::Email},
+    {"e-mail address", Column::Email}, // Outlook
+    {"e-mail 2 address", Column::Email},
+    {"e-mail 3 address", Column::Email},
+    {"e-mail-adresse", Column::Email}, // German Outlook
+    {"e-mail 2: adresse", Column::Email},
+    {"e-mail 3: adresse", Column::Email},
+    {"e-mail 1 - value", Column::Email}, // Google
+    {"e-mail 2 - value", Column::Email},
+    {"e-mail 3 - value", Column::Email},
+    {"e-mail 4 - value", Column::Email},
+    {"email home", Column::Email}, // address books of mobile phones
+    {"email work", Column::Email},
+    {"groups", Column::Groups}, // our own
+    {"group", Column::Groups},
+    {"categories", Column::Groups},       // Outlook
+    {"kategorien", Column::Groups},       // German Outlook
+    {"group membership", Column::Groups}, // Google
 };
 
 struct Columns {

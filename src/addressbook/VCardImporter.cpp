@@ -399,8 +399,9 @@ private:
     void take(const Line& line) {
         const std::optional<Property> property = parseProperty(line.text);
         if (!property) {
-            skipLine(line, LocalizedString("this line has no \":\" between a property and its "
-                                           "value"));
+            parsed.skip(line.number,
+                        LocalizedString("this line has no \":\" between a property and its "
+                                        "value"));
             return;
         }
         if (property->name == "BEGIN") {
@@ -408,8 +409,9 @@ private:
         } else if (!card) {
             // One report for a run of lines outside any card, not one a line.
             if (!outside)
-                skipLine(line, LocalizedString("\"%1\" stands outside BEGIN:VCARD and END:VCARD")
-                                   .arg(QString::fromUtf8(line.text.left(40))));
+                parsed.skip(line.number,
+                            LocalizedString("\"%1\" stands outside BEGIN:VCARD and END:VCARD")
+                                .arg(QString::fromUtf8(line.text.left(40))));
             outside = true;
         } else if (property->name == "END") {
             end();
@@ -422,22 +424,15 @@ private:
                 card->add(*property, line.number, parsed);
             } catch (const ImportError& bad) {
                 parsed.skip(bad.line(), bad.detail());
-                hadBadValue = true;
             }
         }
-    }
-
-    void skipLine(const Line& line, const QString& reason) {
-        parsed.skip(line.number, reason);
-        if (card)
-            hadBadValue = true;
     }
 
     void begin(const Line& line, const Property& property) {
         if (property.value.trimmed().toUpper() != "VCARD") {
             if (!card && !outside)
-                skipLine(line, LocalizedString("\"BEGIN:%1\" does not begin a vCard")
-                                   .arg(QString::fromUtf8(property.value.trimmed())));
+                parsed.skip(line.number, LocalizedString("\"BEGIN:%1\" does not begin a vCard")
+                                             .arg(QString::fromUtf8(property.value.trimmed())));
             outside = !card;
             return;
         }
@@ -447,7 +442,7 @@ private:
         card->beginLine = line.number;
         sawCard = true;
         outside = false;
-        hadBadValue = false;
+        skippedBefore = parsed.skipped.size();
     }
 
     void dropUnfinishedCard() {
@@ -466,7 +461,8 @@ private:
             if (!card->uid.isEmpty())
                 byUid.insert(card->uid, parsed.contacts.size());
             parsed.contacts.append(*contact);
-        } else if (hadBadValue) {
+        } else if (parsed.skipped.size() > skippedBefore) {
+            // Nothing usable is left of a card whose bad values were skipped.
             ++parsed.contactsSkipped;
         }
         card.reset();
@@ -478,7 +474,7 @@ private:
     std::optional<Card> card;
     bool sawCard = false;
     bool outside = false;
-    bool hadBadValue = false;
+    qsizetype skippedBefore = 0;
 };
 
 } // namespace

@@ -4,6 +4,7 @@
 #include "addressbook/CsvImporter.h"
 #include "addressbook/ImportError.h"
 #include "addressbook/VCardImporter.h"
+#include "fuzz/ImportFuzz.h"
 
 #include <QDir>
 #include <QFile>
@@ -113,6 +114,20 @@ TEST_P(Import, Case) {
 
 INSTANTIATE_TEST_SUITE_P(Contacts, Import, ::testing::ValuesIn(cases("import/cases.txt")),
                          RowName());
+
+// What the importers' fuzz targets require of any input, over their seed files.
+TEST(Import, FuzzSeedsKeepTheFuzzProperties) {
+    for (const auto& [folder, parse] : {std::pair{"CsvFuzz", &CsvImporter::parse},
+                                        std::pair{"VCardFuzz", &VCardImporter::parse}}) {
+        const QDir seeds(PELMO_TEST_DATA "/fuzz/" + QLatin1String(folder));
+        ASSERT_FALSE(seeds.isEmpty());
+        for (const QString& name : seeds.entryList(QDir::Files)) {
+            QFile seed(seeds.filePath(name));
+            ASSERT_TRUE(seed.open(QIODevice::ReadOnly));
+            fuzz::checkImport(parse, seed.readAll());
+        }
+    }
+}
 
 // Persons as their contact lines, with the groups they are in; then each group and its members.
 QString dump(const AddressBook& book) {
