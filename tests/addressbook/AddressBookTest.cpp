@@ -3,6 +3,7 @@
 #include "addressbook/ContactsFile.h"
 #include "addressbook/CsvImporter.h"
 #include "addressbook/ImportError.h"
+#include "addressbook/PersonFilter.h"
 #include "addressbook/VCardImporter.h"
 #include "fuzz/ImportFuzz.h"
 
@@ -212,6 +213,12 @@ QString apply(AddressBook& book, const QStringList& words) {
         return QString::number(book.exportFile(path, words.size() > 2 ? words[2] : QString()));
     if (op == "dump")
         return dump(book);
+    if (op == "find") {
+        QStringList names;
+        for (const Person& found : PersonFilter::filter(book.persons(), words.value(1)))
+            names << found.fullName();
+        return names.isEmpty() ? "none" : names.join(", ");
+    }
     if (op == "into") { // on another book in the folder
         AddressBook another(path);
         return apply(another, words.mid(2));
