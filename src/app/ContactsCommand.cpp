@@ -44,21 +44,10 @@ int importContacts(const QString& path) {
     } catch (const ImportError& unusable) {
         return fail(path + QStringLiteral(": ") + unusable.reason());
     }
-    QString line =
-        LocalizedString("Imported %1: %2 added, %3 updated, %4 skipped; %5.")
-            .arg(QFileInfo(path).fileName(), counted(summary.personsAdded, "person", "persons"))
-            .arg(summary.personsUpdated)
-            .arg(summary.personsSkipped)
-            .arg(counted(summary.groupsAdded, "new group", "new groups"));
-    if (summary.personsUnchanged > 0)
-        line += QLatin1Char(' ') + LocalizedString("%1 already in the address book as in the "
-                                                   "file.")
-                                       .arg(counted(summary.personsUnchanged, "was", "were"));
     QTextStream out(stdout);
-    out << line << '\n';
-    for (const SkippedValue& skipped : std::as_const(summary.skipped))
-        out << LocalizedString("line %1: %2 (skipped)").arg(skipped.line).arg(skipped.reason)
-            << '\n';
+    out << summary.headline(QFileInfo(path).fileName()) << '\n';
+    for (const QString& skipped : summary.skippedLines())
+        out << skipped << '\n';
     return 0;
 }
 
