@@ -1,17 +1,21 @@
 #include "addressbook/AddressBook.h"
 
+#include "addressbook/ContactsFile.h"
 #include "addressbook/ImportText.h"
+#include "addressbook/VCardExporter.h"
 #include "util/DataFolder.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
 #include "util/PrivateFiles.h"
 
+#include <QFile>
 #include <QHash>
 #include <QSet>
 #include <QSqlDatabase>
 #include <QSqlError>
 #include <QSqlQuery>
 
+#include <algorithm>
 #include <atomic>
 #include <cerrno>
 #include <cstring>
@@ -37,13 +41,14 @@ QString nullableText(const QVariant& value) {
     return value.isNull() ? QString() : value.toString();
 }
 
-// The identity used to recognise a person already in the book.
-QString personKey(const Person& person) {
-    return person.firstName + QChar(0x1f) + person.lastName + QChar(0x1f) +
-           person.primaryEmail().toCaseFolded();
-}
-
 constexpr const char* kPersonColumns = "p.id, p.first_name, p.last_name, p.primary_position";
+constexpr const char* kInsertPerson =
+    "INSERT INTO persons (first_name, last_name, primary_position) VALUES (?, ?, ?)";
+constexpr const char* kInsertEmail =
+    "INSERT INTO emails (person_id, position, address) VALUES (?, ?, ?)";
+constexpr const char* kInsertMember =
+    "INSERT OR IGNORE INTO group_members (group_id, person_id, position) VALUES (?, ?, "
+    "(SELECT COALESCE(MAX(position), 0) + 1 FROM group_members WHERE group_id = ?))";
 
 [[noreturn]] void refuse(const char* name, const QString& reason) {
     throw PelmoException(QString::fromLatin1(name), reason);
@@ -262,51 +267,202 @@ void AddressBook::inTransaction(const std::function<void()>& change) {
     }
 }
 
+// Where an import finds the persons it may be adding again: by address, and, for persons
+// without any, by name.
+struct AddressBook::Known {
+    QList<Person> persons;
+    QHash<QString, qsizetype> byAddress;
+    QHash<QString, qsizetype> byNameAlone;
+
+    // A primary address outranks the same address held as a secondary one by someone else.
+    explicit Known(QList<Person> all) : persons(std::move(all)) {
+        for (qsizetype at = 0; at < persons.size(); ++at) {
+            if (persons[at].emails.isEmpty())
+                byNameAlone.insert(persons[at].fullName().toCaseFolded(), at);
+            else
+                byAddress.insert(persons[at].primaryEmail().toCaseFolded(), at);
+        }
+        for (qsizetype at = 0; at < persons.size(); ++at)
+            addAddresses(at, persons[at].emails);
+    }
+
+    void addAddresses(qsizetype at, const QStringList& addresses) {
+        for (const QString& address : addresses)
+            byAddress.insert(address.toCaseFolded(), byAddress.value(address.toCaseFolded(), at));
+    }
+
+    qsizetype find(const Person& person) const {
+        if (person.emails.isEmpty())
+            return byNameAlone.value(person.fullName().toCaseFolded(), -1);
+        return byAddress.value(person.primaryEmail().toCaseFolded(), -1);
+    }
+};
+
 ImportSummary AddressBook::add(const QList<ImportedContact>& contacts) {
     ImportSummary summary;
     inTransaction([&] {
-        QHash<QString, qint64> known;
-        for (const Person& person : persons())
-            known.insert(personKey(person), person.id);
-        QSet<QString> groupNames;
-        for (const ImportedContact& contact : contacts) {
-            const QString key = personKey(contact.person);
-            qint64 id = known.value(key, 0);
-            if (id != 0) {
-                ++summary.personsKnown;
-            } else {
-                id = insertPerson(contact.person);
-                known.insert(key, id);
+        Known known(persons());
+        const qsizetype before = known.persons.size();
+        QHash<QString, qint64> groupIds;
+        for (const Group& group : groups())
+            groupIds.insert(group.name.toCaseFolded(), group.id);
+        QSet<std::pair<qint64, qint64>> memberships;
+        QSqlQuery current =
+            prepared(QStringLiteral("SELECT group_id, person_id FROM group_members"));
+        run(current);
+        while (current.next())
+            memberships.insert({current.value(0).toLongLong(), current.value(1).toLongLong()});
+        QSqlQuery insertPersonQuery = prepared(QString::fromLatin1(kInsertPerson));
+        QSqlQuery insertEmailQuery = prepared(QString::fromLatin1(kInsertEmail));
+        QSqlQuery insertMemberQuery = prepared(QString::fromLatin1(kInsertMember));
+        QSet<qint64> matched;
+        QSet<qint64> updated;
+        for (const auto& [incoming, groupNames] : contacts) {
+            qsizetype at = known.find(incoming);
+            bool changed = false;
+            if (at < 0) {
+                Person person = incoming;
+                person.id = insertPerson(person, insertPersonQuery, insertEmailQuery);
+                known.persons.append(person);
+                at = known.persons.size() - 1;
+                if (person.emails.isEmpty())
+                    known.byNameAlone.insert(person.fullName().toCaseFolded(), at);
+                known.addAddresses(at, person.emails);
                 ++summary.personsAdded;
+            } else {
+                changed = merge(known, at, incoming, insertEmailQuery);
             }
-            for (const QString& name : contact.groups) {
-                groupNames.insert(name.toCaseFolded());
-                insertMember(groupId(name), id);
+            const qint64 personId = known.persons.at(at).id;
+            for (const QString& name : groupNames) {
+                qint64& group = groupIds[name.toCaseFolded()];
+                if (group == 0) {
+                    group = groupId(name);
+                    ++summary.groupsAdded;
+                }
+                if (!memberships.contains({group, personId})) {
+                    insertMember(insertMemberQuery, group, personId);
+                    memberships.insert({group, personId});
+                    changed = true;
+                }
+            }
+            if (at < before) {
+                matched.insert(personId);
+                if (changed)
+                    updated.insert(personId);
             }
         }
-        summary.groups = static_cast<int>(groupNames.size());
+        summary.personsUpdated = static_cast<int>(updated.size());
+        summary.personsUnchanged = static_cast<int>(matched.size() - updated.size());
     });
     return summary;
 }
 
-qint64 AddressBook::insertPerson(const Person& person) {
-    QSqlQuery insert = prepared(QStringLiteral(
-        "INSERT INTO persons (first_name, last_name, primary_position) VALUES (?, ?, ?)"));
-    insert.addBindValue(person.firstName);
-    insert.addBindValue(person.lastName);
-    insert.addBindValue(person.emails.isEmpty() ? -1 : person.primary);
+// The person at `at` gains what incoming has and it lacks; answers whether anything changed.
+bool AddressBook::merge(Known& known, qsizetype at, const Person& incoming,
+                        QSqlQuery& insertEmailQuery) {
+    Person& person = known.persons[at];
+    QStringList fresh;
+    for (const QString& address : incoming.emails)
+        if (!person.emails.contains(address, Qt::CaseInsensitive) &&
+            !fresh.contains(address, Qt::CaseInsensitive))
+            fresh.append(address);
+    const bool hadNoAddress = person.emails.isEmpty();
+    bool renamed = false;
+    if (person.firstName.isEmpty() && !incoming.firstName.isEmpty()) {
+        person.firstName = incoming.firstName;
+        renamed = true;
+    }
+    if (person.lastName.isEmpty() && !incoming.lastName.isEmpty()) {
+        person.lastName = incoming.lastName;
+        renamed = true;
+    }
+    if (!fresh.isEmpty()) {
+        insertEmails(insertEmailQuery, person.id, fresh, static_cast<int>(person.emails.size()));
+        person.emails += fresh;
+        known.addAddresses(at, fresh);
+    }
+    if (hadNoAddress && !fresh.isEmpty()) {
+        known.byNameAlone.remove(person.fullName().toCaseFolded());
+        person.primary = 0;
+    }
+    if (renamed || (hadNoAddress && !fresh.isEmpty()))
+        execute("UPDATE persons SET first_name = ?, last_name = ?, primary_position = ? "
+                "WHERE id = ?",
+                {person.firstName, person.lastName, person.primary, person.id});
+    return renamed || !fresh.isEmpty();
+}
+
+ImportSummary AddressBook::importFile(const QString& path) {
+    const ParsedContacts parsed = ContactsFile::read(path);
+    ImportSummary summary = add(parsed.contacts);
+    summary.personsSkipped = parsed.contactsSkipped;
+    summary.skipped = parsed.skipped;
+    std::stable_sort(summary.skipped.begin(), summary.skipped.end(),
+                     [](const SkippedValue& a, const SkippedValue& b) { return a.line < b.line; });
+    return summary;
+}
+
+QHash<qint64, int> AddressBook::memberCounts() const {
+    QSqlQuery query =
+        prepared(QStringLiteral("SELECT group_id, COUNT(*) FROM group_members GROUP BY group_id"));
+    run(query);
+    QHash<qint64, int> counts;
+    while (query.next())
+        counts.insert(query.value(0).toLongLong(), query.value(1).toInt());
+    return counts;
+}
+
+int AddressBook::exportFile(const QString& path, const QString& groupName) const {
+    QList<ImportedContact> contacts;
+    if (!groupName.isNull()) {
+        const std::optional<Group> group = groupNamed(groupName);
+        if (!group)
+            refuse("NoSuchGroup",
+                   LocalizedString("The address book has no group named \"%1\".").arg(groupName));
+        // Only the group's own name goes along: the other groups are none of the reader's
+        // business.
+        for (const Person& person : members(group->id).value_or(QList<Person>()))
+            contacts.append({person, {group->name}});
+    } else {
+        QHash<qint64, QStringList> groupsOf;
+        QSqlQuery query = prepared(
+            QStringLiteral("SELECT m.person_id, g.name FROM group_members m JOIN groups g ON "
+                           "g.id = m.group_id ORDER BY g.folded"));
+        run(query);
+        while (query.next())
+            groupsOf[query.value(0).toLongLong()].append(query.value(1).toString());
+        for (const Person& person : persons())
+            contacts.append({person, groupsOf.value(person.id)});
+    }
+    const QByteArray cards = VCardExporter::write(contacts);
+    QFile file(path);
+    const auto cannotWrite = [&](const QString& reason) {
+        refuse("ExportFailed",
+               LocalizedString("The file \"%1\" cannot be written: %2").arg(path, reason));
+    };
+    if (!MakePrivateFile(std::filesystem::path(path.toStdString())))
+        cannotWrite(QString::fromLocal8Bit(std::strerror(errno)));
+    if (!file.open(QIODevice::WriteOnly | QIODevice::Truncate) ||
+        file.write(cards) != cards.size() || !file.flush())
+        cannotWrite(file.errorString());
+    return static_cast<int>(contacts.size());
+}
+
+qint64 AddressBook::insertPerson(const Person& person, QSqlQuery& insert, QSqlQuery& email) {
+    insert.bindValue(0, person.firstName);
+    insert.bindValue(1, person.lastName);
+    insert.bindValue(2, person.emails.isEmpty() ? -1 : person.primary);
     run(insert);
     const qint64 id = insert.lastInsertId().toLongLong();
-    insertEmails(id, person.emails);
+    insertEmails(email, id, person.emails, 0);
     return id;
 }
 
-void AddressBook::insertEmails(qint64 personId, const QStringList& emails) {
-    QSqlQuery email = prepared(
-        QStringLiteral("INSERT INTO emails (person_id, position, address) VALUES (?, ?, ?)"));
+void AddressBook::insertEmails(QSqlQuery& email, qint64 personId, const QStringList& emails,
+                               int firstPosition) {
     for (qsizetype i = 0; i < emails.size(); ++i) {
         email.bindValue(0, personId);
-        email.bindValue(1, static_cast<int>(i));
+        email.bindValue(1, firstPosition + static_cast<int>(i));
         email.bindValue(2, emails.at(i));
         run(email);
     }
@@ -322,10 +478,11 @@ qint64 AddressBook::groupId(const QString& name) {
     return insert.lastInsertId().toLongLong();
 }
 
-void AddressBook::insertMember(qint64 group, qint64 person) {
-    execute("INSERT OR IGNORE INTO group_members (group_id, person_id, position) VALUES (?, ?, "
-            "(SELECT COALESCE(MAX(position), 0) + 1 FROM group_members WHERE group_id = ?))",
-            {group, person, group});
+void AddressBook::insertMember(QSqlQuery& insert, qint64 group, qint64 person) {
+    insert.bindValue(0, group);
+    insert.bindValue(1, person);
+    insert.bindValue(2, group);
+    run(insert);
 }
 
 void AddressBook::execute(const char* sql, const QVariantList& values) {
@@ -362,7 +519,11 @@ QString AddressBook::newGroupName(const QString& name, qint64 renamedGroupId) co
 qint64 AddressBook::addPerson(const Person& person) {
     checkPerson(person);
     qint64 id = 0;
-    inTransaction([&] { id = insertPerson(person); });
+    inTransaction([&] {
+        QSqlQuery insert = prepared(QString::fromLatin1(kInsertPerson));
+        QSqlQuery email = prepared(QString::fromLatin1(kInsertEmail));
+        id = insertPerson(person, insert, email);
+    });
     return id;
 }
 
@@ -375,7 +536,8 @@ void AddressBook::updatePerson(const Person& person) {
                 {person.firstName, person.lastName, person.emails.isEmpty() ? -1 : person.primary,
                  person.id});
         execute("DELETE FROM emails WHERE person_id = ?", {person.id});
-        insertEmails(person.id, person.emails);
+        QSqlQuery email = prepared(QString::fromLatin1(kInsertEmail));
+        insertEmails(email, person.id, person.emails, 0);
     });
 }
 
@@ -412,7 +574,8 @@ void AddressBook::addMember(qint64 groupId, qint64 personId) {
     inTransaction([&] {
         requireGroup(groupId);
         requirePerson(personId);
-        insertMember(groupId, personId);
+        QSqlQuery insert = prepared(QString::fromLatin1(kInsertMember));
+        insertMember(insert, groupId, personId);
     });
 }
 

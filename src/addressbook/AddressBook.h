@@ -1,9 +1,11 @@
 #pragma once
 
 #include "addressbook/Group.h"
+#include "addressbook/ImportSummary.h"
 #include "addressbook/ImportedContact.h"
 #include "addressbook/Person.h"
 
+#include <QHash>
 #include <QList>
 #include <QString>
 #include <QVariant>
@@ -12,15 +14,6 @@
 #include <optional>
 
 class QSqlQuery;
-
-/** What one import changed. */
-struct ImportSummary {
-    int personsAdded = 0;
-    /** Contacts of the file that were already in the book (same names, same primary address). */
-    int personsKnown = 0;
-    /** Distinct groups the file named, new or not. */
-    int groups = 0;
-};
 
 /**
  * The address book: persons (first name, last name, e-mail addresses of which one is primary)
@@ -57,14 +50,33 @@ public:
     std::optional<Group> groupNamed(const QString& name) const;
     /** The group's members in order; nullopt when there is no such group. */
     std::optional<QList<Person>> members(qint64 groupId) const;
+    /** The number of members of every group, by group id; groups without members are left out. */
+    QHash<qint64, int> memberCounts() const;
 
     /**
      * Adds the contacts in one transaction: on any failure nothing of them is kept. A contact
-     * with the names and primary address (ignoring letter case) of a person already in the
-     * book is that person, who only joins the contact's groups. Missing groups are created;
-     * new members join at the end of a group.
+     * whose primary address (ignoring letter case) is an address of a person already in the
+     * book, or in the contacts before it, is that person: the person gains the contact's other
+     * addresses (after its own, its primary kept), the name parts it lacks, and the contact's
+     * groups. A contact without addresses is the person of the same name who has none either.
+     * Missing groups are created; new members join at the end of a group. Adding the same
+     * contacts twice changes nothing the second time.
      */
     ImportSummary add(const QList<ImportedContact>& contacts);
+    /**
+     * Reads the contacts file at path (ContactsFile) and adds its contacts; the summary also
+     * lists the values the file's reader left out. Throws ImportError when the file cannot be
+     * read or is no contacts file, and PelmoException as add() does.
+     */
+    ImportSummary importFile(const QString& path);
+    /**
+     * Writes the persons of the book, or the members of the group named groupName (ignoring
+     * letter case) when it is not null, as a vCard 4.0 file (VCardExporter) at path, which is
+     * private to the user (0600). Each card lists the person's groups, or only that group.
+     * Answers the number of persons written. Throws PelmoException named NoSuchGroup for an
+     * unknown group and ExportFailed, with the system's reason, when the file cannot be written.
+     */
+    int exportFile(const QString& path, const QString& groupName = QString()) const;
 
     // Editing, one change at a time. Each change runs in a transaction of its own: it is kept
     // whole or not at all. A change the book refuses throws PelmoException named NoSuchPerson,
@@ -101,10 +113,13 @@ private:
     void run(QSqlQuery& query) const;
     QList<Person> loadPersons(const QString& personsSql, const QString& emailsSql,
                               const QVariant& bound = {}) const;
-    qint64 insertPerson(const Person& person);
-    void insertEmails(qint64 personId, const QStringList& emails);
+    struct Known;
+    bool merge(Known& known, qsizetype at, const Person& incoming, QSqlQuery& insertEmailQuery);
+    qint64 insertPerson(const Person& person, QSqlQuery& insert, QSqlQuery& email);
+    void insertEmails(QSqlQuery& email, qint64 personId, const QStringList& emails,
+                      int firstPosition);
     qint64 groupId(const QString& name);
-    void insertMember(qint64 group, qint64 person);
+    void insertMember(QSqlQuery& insert, qint64 group, qint64 person);
     /** Runs change in a transaction, rolled back when change throws. */
     void inTransaction(const std::function<void()>& change);
     /** Runs sql with values bound in order. */

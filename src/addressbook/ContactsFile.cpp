@@ -8,7 +8,7 @@
 
 #include <QFile>
 
-QList<ImportedContact> ContactsFile::read(const QString& path) {
+ParsedContacts ContactsFile::read(const QString& path) {
     QFile file(path);
     if (!file.open(QIODevice::ReadOnly))
         throw ImportError(0,
@@ -24,5 +24,5 @@ bool ContactsFile::isVCard(const QString& path, const QByteArray& data) {
     const QString lower = path.toLower();
     if (lower.endsWith(QLatin1String(".vcf")) || lower.endsWith(QLatin1String(".vcard")))
         return true;
-    return ImportText::withoutBom(data).trimmed().left(11).toUpper() == "BEGIN:VCARD";
+    return ImportText::asUtf8(data).trimmed().left(11).toUpper() == "BEGIN:VCARD";
 }

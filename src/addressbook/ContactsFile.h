@@ -1,8 +1,8 @@
 #pragma once
 
-#include "addressbook/ImportedContact.h"
+#include "addressbook/ParsedContacts.h"
 
-#include <QList>
+#include <QByteArray>
 #include <QString>
 
 /** A contacts file on disk, read by the importer its kind calls for. */
@@ -10,10 +10,10 @@ class ContactsFile {
 public:
     /**
      * Reads and parses the whole file: vCard when its name ends in .vcf or .vcard or its text
-     * begins with BEGIN:VCARD, CSV otherwise. Throws ImportError when the file cannot be read
-     * or is malformed.
+     * begins with BEGIN:VCARD, CSV otherwise. Bad values are left out and reported; throws
+     * ImportError when the file cannot be read or is no contacts file at all.
      */
-    static QList<ImportedContact> read(const QString& path);
+    static ParsedContacts read(const QString& path);
     /** True when the file is to be read as vCard. */
     static bool isVCard(const QString& path, const QByteArray& data);
 };

@@ -14,10 +14,13 @@ public:
                          line > 0
                              ? LocalizedString("line %1: %2").arg(QString::number(line), message)
                              : message),
-          faultLine(line) {}
+          faultLine(line), faultDetail(message) {}
 
     int line() const noexcept { return faultLine; }
+    /** The reason without the line number. */
+    const QString& detail() const noexcept { return faultDetail; }
 
 private:
     int faultLine;
+    QString faultDetail;
 };

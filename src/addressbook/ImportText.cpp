@@ -13,12 +13,29 @@ std::optional<QString> ImportText::decode(const QByteArray& bytes, const QString
     return QString(decoder.decode(bytes));
 }
 
+namespace {
+
+bool startsWithUtf16Bom(const QByteArray& bytes) {
+    return bytes.startsWith("\xFF\xFE") || bytes.startsWith("\xFE\xFF");
+}
+
+} // namespace
+
 QString ImportText::decodeUnlabelled(const QByteArray& bytes) {
+    // A byte order mark outranks any guess: Outlook's "Unicode" exports are UTF-16.
+    if (bytes.startsWith("\xFF\xFE"))
+        return decode(bytes.mid(2), QStringLiteral("UTF-16LE")).value_or(QString());
+    if (bytes.startsWith("\xFE\xFF"))
+        return decode(bytes.mid(2), QStringLiteral("UTF-16BE")).value_or(QString());
     const QByteArray body = withoutBom(bytes);
     const QString text = DecodeUtf8Strictly(body);
     if (!text.isNull())
         return text;
     return decode(body, QStringLiteral("windows-1252")).value_or(QString::fromLatin1(body));
+}
+
+QByteArray ImportText::asUtf8(const QByteArray& bytes) {
+    return startsWithUtf16Bom(bytes) ? decodeUnlabelled(bytes).toUtf8() : withoutBom(bytes);
 }
 
 QByteArray ImportText::withoutBom(const QByteArray& bytes) {

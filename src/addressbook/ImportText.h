@@ -11,11 +11,16 @@ public:
     /** bytes decoded from the named character set; nullopt when the name is unknown. */
     static std::optional<QString> decode(const QByteArray& bytes, const QString& charset);
     /**
-     * bytes whose character set nobody named: UTF-8 when they are valid UTF-8, else
-     * Windows-1252 (what spreadsheet programs and older exporters write), a leading UTF-8
-     * byte order mark dropped.
+     * bytes whose character set nobody named: UTF-16 (little or big endian) after its byte
+     * order mark, else UTF-8 when they are valid UTF-8 (a UTF-8 byte order mark dropped), else
+     * Windows-1252 (what spreadsheet programs and older exporters write).
      */
     static QString decodeUnlabelled(const QByteArray& bytes);
+    /**
+     * bytes without a leading UTF-8 byte order mark, or, after a UTF-16 one, the text in UTF-8:
+     * for readers that work on 8-bit lines. Other bytes are answered as they are.
+     */
+    static QByteArray asUtf8(const QByteArray& bytes);
     /** bytes without a leading UTF-8 byte order mark. */
     static QByteArray withoutBom(const QByteArray& bytes);
     /**

@@ -37,13 +37,17 @@ struct Property {
     }
 };
 
-// Physical lines end in CRLF, LF or a lone CR; the last one needs no end.
+// Physical lines end in CRLF or LF, or in a lone CR in a file without any LF (as old Mac
+// programs wrote); elsewhere a lone CR is a stray character of its line. The last line needs
+// no end.
 QList<Line> physicalLines(const QByteArray& data) {
     QList<Line> lines;
     qsizetype start = 0;
     int number = 1;
+    const bool loneCrEndsLines = !data.contains('\n');
     for (qsizetype i = 0; i <= data.size(); ++i) {
-        if (i < data.size() && data[i] != '\r' && data[i] != '\n')
+        if (i < data.size() && data[i] != '\n' &&
+            (data[i] != '\r' || !(loneCrEndsLines || data.mid(i + 1, 1) == "\n")))
             continue;
         if (i < data.size() || start < data.size())
             lines.append({number++, data.mid(start, i - start)});
@@ -65,7 +69,7 @@ bool isQuotedPrintable(const QByteArray& line) {
 // "=" when they go on (RFC 2045 6.7, rule 5), whatever the next line starts with.
 QList<Line> logicalLines(const QByteArray& data) {
     QList<Line> logical;
-    for (const Line& line : physicalLines(ImportText::withoutBom(data))) {
+    for (const Line& line : physicalLines(ImportText::asUtf8(data))) {
         if (!logical.isEmpty()) {
             QByteArray& last = logical.last().text;
             if (last.endsWith('=') && isQuotedPrintable(last)) {
@@ -188,7 +192,8 @@ QStringList splitEscaped(const QString& value, QChar separator, bool version21,
         const QChar c = value[i];
         if (c == QLatin1Char('\\') && i + 1 < value.size()) {
             const QChar next = value[i + 1];
-            if (!version21 || next == QLatin1Char(';')) {
+            // Outlook's 2.1 files escape the comma in CATEGORIES as later versions do.
+            if (!version21 || next == QLatin1Char(';') || (next == separator && !keepEscapes)) {
                 const bool lineBreak = next == QLatin1Char('n') || next == QLatin1Char('N');
                 if (keepEscapes)
                     current += c;
@@ -230,6 +235,11 @@ QString uidKey(const QString& uid) {
 struct Card {
     int beginLine = 0;
     bool version21 = false;
+    bool hasName = false;
+    bool hasFormatted = false;
+    /** Why the whole card is left out (an unknown version), or null. */
+    QString fault;
+    int faultLine = 0;
     QString first, last, formatted;
     QList<std::pair<QString, int>> emails; // address and preference rank, lower first
     QStringList categories;
@@ -237,32 +247,39 @@ struct Card {
     QString uid;
     QStringList members;
 
-    void add(const Property& property, int line) {
+    // Takes one property; a bad value throws ImportError and costs only that property.
+    void add(const Property& property, int line, ParsedContacts& parsed) {
         const QByteArray& name = property.name;
-        if (name == "VERSION")
+        if (name == "VERSION") {
             setVersion(QString::fromLatin1(property.value.trimmed()), line);
-        else if (name == "N")
+        } else if (name == "N" && !hasName) {
+            // Some exporters repeat N; the first is the one the card was written with.
+            hasName = true;
             setName(decodedValue(property, line), line);
-        else if (name == "FN")
+        } else if (name == "FN" && !hasFormatted) {
+            hasFormatted = true;
             formatted = cleanName(unescaped(decodedValue(property, line), version21), line);
-        else if (name == "EMAIL")
+        } else if (name == "EMAIL") {
             addEmail(property, line);
-        else if (name == "CATEGORIES")
-            addCategories(decodedValue(property, line), line);
-        else if (name == "KIND" || name == "X-ADDRESSBOOKSERVER-KIND")
+        } else if (name == "CATEGORIES") {
+            addCategories(decodedValue(property, line), line, parsed);
+        } else if (name == "KIND" || name == "X-ADDRESSBOOKSERVER-KIND") {
             isGroup = property.value.trimmed().compare("group", Qt::CaseInsensitive) == 0;
-        else if (name == "UID")
+        } else if (name == "UID") {
             uid = uidKey(decodedValue(property, line));
-        else if (name == "MEMBER" || name == "X-ADDRESSBOOKSERVER-MEMBER")
+        } else if (name == "MEMBER" || name == "X-ADDRESSBOOKSERVER-MEMBER") {
             members.append(uidKey(decodedValue(property, line)));
+        }
     }
 
     void setVersion(const QString& version, int line) {
         if (version != QLatin1String("2.1") && version != QLatin1String("3.0") &&
-            version != QLatin1String("4.0"))
-            throw ImportError(line, LocalizedString("vCard version \"%1\" is not supported "
-                                                    "(2.1, 3.0 and 4.0 are)")
-                                        .arg(version));
+            version != QLatin1String("4.0")) {
+            fault = LocalizedString("vCard version \"%1\" is not supported (2.1, 3.0 and 4.0 "
+                                    "are)")
+                        .arg(version);
+            faultLine = line;
+        }
         version21 = version == QLatin1String("2.1");
     }
 
@@ -301,11 +318,16 @@ struct Card {
         emails.append({address, rank});
     }
 
-    void addCategories(const QString& value, int line) {
+    // RFC 6350 6.7.1: CATEGORIES is a list separated by commas; "\," is part of a name.
+    void addCategories(const QString& value, int line, ParsedContacts& parsed) {
         for (const QString& category : splitEscaped(value, QLatin1Char(','), version21)) {
-            const QString name = cleanName(category, line);
-            if (!name.isEmpty() && !categories.contains(name, Qt::CaseInsensitive))
-                categories.append(name);
+            try {
+                const QString name = cleanName(category, line);
+                if (!name.isEmpty() && !categories.contains(name, Qt::CaseInsensitive))
+                    categories.append(name);
+            } catch (const ImportError& bad) {
+                parsed.skip(bad.line(), bad.detail());
+            }
         }
     }
 
@@ -315,6 +337,7 @@ struct Card {
         return personWithoutAddresses().fullName();
     }
 
+    // FN stands in for N when N gives no name at all (RFC 6350 makes FN the one required name).
     Person personWithoutAddresses() const {
         Person person;
         person.firstName = first;
@@ -358,52 +381,104 @@ void addGroupMembers(const QList<Card>& groups, const QHash<QString, qsizetype>&
     }
 }
 
-} // namespace
+// Reads the cards of a file, leaving out and reporting what cannot be read.
+class CardReader {
+public:
+    ParsedContacts read(const QByteArray& data) {
+        for (const Line& line : logicalLines(data))
+            take(line);
+        if (card)
+            dropUnfinishedCard();
+        if (!sawCard)
+            throw ImportError(0, LocalizedString("the file holds no vCard"));
+        addGroupMembers(groups, byUid, parsed.contacts);
+        return parsed;
+    }
 
-QList<ImportedContact> VCardImporter::parse(const QByteArray& data) {
-    QList<ImportedContact> contacts;
+private:
+    void take(const Line& line) {
+        const std::optional<Property> property = parseProperty(line.text);
+        if (!property) {
+            parsed.skip(line.number,
+                        LocalizedString("this line has no \":\" between a property and its "
+                                        "value"));
+            return;
+        }
+        if (property->name == "BEGIN") {
+            begin(line, *property);
+        } else if (!card) {
+            // One report for a run of lines outside any card, not one a line.
+            if (!outside)
+                parsed.skip(line.number,
+                            LocalizedString("\"%1\" stands outside BEGIN:VCARD and END:VCARD")
+                                .arg(QString::fromUtf8(line.text.left(40))));
+            outside = true;
+        } else if (property->name == "END") {
+            end();
+        } else if (line.text.contains('\r')) {
+            parsed.skip(line.number, LocalizedString("a carriage return stands inside the %1 "
+                                                     "property")
+                                         .arg(QString::fromLatin1(property->name)));
+        } else {
+            try {
+                card->add(*property, line.number, parsed);
+            } catch (const ImportError& bad) {
+                parsed.skip(bad.line(), bad.detail());
+            }
+        }
+    }
+
+    void begin(const Line& line, const Property& property) {
+        if (property.value.trimmed().toUpper() != "VCARD") {
+            if (!card && !outside)
+                parsed.skip(line.number, LocalizedString("\"BEGIN:%1\" does not begin a vCard")
+                                             .arg(QString::fromUtf8(property.value.trimmed())));
+            outside = !card;
+            return;
+        }
+        if (card)
+            dropUnfinishedCard();
+        card.emplace();
+        card->beginLine = line.number;
+        sawCard = true;
+        outside = false;
+        skippedBefore = parsed.skipped.size();
+    }
+
+    void dropUnfinishedCard() {
+        parsed.skip(card->beginLine, LocalizedString("this card has no END:VCARD"));
+        ++parsed.contactsSkipped;
+        card.reset();
+    }
+
+    void end() {
+        if (!card->fault.isNull()) {
+            parsed.skip(card->faultLine, card->fault);
+            ++parsed.contactsSkipped;
+        } else if (card->isGroup) {
+            groups.append(*card);
+        } else if (const auto contact = card->contact()) {
+            if (!card->uid.isEmpty())
+                byUid.insert(card->uid, parsed.contacts.size());
+            parsed.contacts.append(*contact);
+        } else if (parsed.skipped.size() > skippedBefore) {
+            // Nothing usable is left of a card whose bad values were skipped.
+            ++parsed.contactsSkipped;
+        }
+        card.reset();
+    }
+
+    ParsedContacts parsed;
     QList<Card> groups;
     QHash<QString, qsizetype> byUid;
     std::optional<Card> card;
     bool sawCard = false;
-    for (const Line& line : logicalLines(data)) {
-        const std::optional<Property> property = parseProperty(line.text);
-        if (!property)
-            throw ImportError(line.number, LocalizedString("this line has no \":\" between a "
-                                                           "property and its value"));
-        const QByteArray value = property->value.trimmed().toUpper();
-        if (property->name == "BEGIN") {
-            if (value != "VCARD")
-                throw ImportError(line.number,
-                                  LocalizedString("\"BEGIN:%1\" does not begin a vCard")
-                                      .arg(QString::fromUtf8(property->value.trimmed())));
-            if (card)
-                throw ImportError(line.number, LocalizedString("a card begins here before the "
-                                                               "previous one has ended"));
-            card.emplace();
-            card->beginLine = line.number;
-            sawCard = true;
-        } else if (!card) {
-            throw ImportError(line.number,
-                              LocalizedString("\"%1\" stands outside BEGIN:VCARD and END:VCARD")
-                                  .arg(QString::fromUtf8(line.text.left(40))));
-        } else if (property->name == "END") {
-            if (card->isGroup) {
-                groups.append(*card);
-            } else if (const auto contact = card->contact()) {
-                if (!card->uid.isEmpty())
-                    byUid.insert(card->uid, contacts.size());
-                contacts.append(*contact);
-            }
-            card.reset();
-        } else {
-            card->add(*property, line.number);
-        }
-    }
-    if (card)
-        throw ImportError(card->beginLine, LocalizedString("this card has no END:VCARD"));
-    if (!sawCard)
-        throw ImportError(0, LocalizedString("the file holds no vCard"));
-    addGroupMembers(groups, byUid, contacts);
-    return contacts;
+    bool outside = false;
+    qsizetype skippedBefore = 0;
+};
+
+} // namespace
+
+ParsedContacts VCardImporter::parse(const QByteArray& data) {
+    return CardReader().read(data);
 }

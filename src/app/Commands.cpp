@@ -20,7 +20,10 @@ struct Command {
 const std::vector<Command> kCommands = {
     {"contacts", contacts,
      "pelmo contacts import FILE          add a vCard (.vcf) or CSV file to the address book\n"
-     "  pelmo contacts list [--group NAME]  list everyone, or the members of one group"},
+     "  pelmo contacts export [--group NAME] FILE.vcf\n"
+     "                                      write everyone, or one group, as a vCard 4.0 file\n"
+     "  pelmo contacts list [--group NAME]  list everyone, or the members of one group\n"
+     "  pelmo contacts groups               list the groups and how many members each has"},
     {"send", send,
      "pelmo send [options]                one mailing run without a window (pelmo send --help)"},
     {"relink", relink,

@@ -3,7 +3,9 @@
 #include "addressbook/ContactsFile.h"
 #include "addressbook/CsvImporter.h"
 #include "addressbook/ImportError.h"
+#include "addressbook/PersonFilter.h"
 #include "addressbook/VCardImporter.h"
+#include "fuzz/ImportFuzz.h"
 
 #include <QDir>
 #include <QFile>
@@ -94,11 +96,16 @@ TEST_P(Import, Case) {
     QStringList lines;
     try {
         const QString& kind = GetParam().kind;
-        for (const auto& [person, groups] :
-             kind == "vcard" ? VCardImporter::parse(input)
-             : kind == "csv" ? CsvImporter::parse(input)
-                             : ContactsFile::read(PELMO_TEST_DATA "/import/" + input.trimmed()))
+        const ParsedContacts parsed =
+            kind == "vcard" ? VCardImporter::parse(input)
+            : kind == "csv" ? CsvImporter::parse(input)
+                            : ContactsFile::read(PELMO_TEST_DATA "/import/" + input.trimmed());
+        for (const auto& [person, groups] : parsed.contacts)
             lines << contactLine(person, groups);
+        for (const SkippedValue& skipped : parsed.skipped)
+            lines << QStringLiteral("skipped %1: %2").arg(skipped.line).arg(skipped.reason);
+        if (parsed.contactsSkipped > 0)
+            lines << QStringLiteral("%1 left out").arg(parsed.contactsSkipped);
     } catch (const ImportError& error) {
         EXPECT_EQ(error.name(), "MalformedContactsFile");
         lines << QStringLiteral("error %1: %2").arg(error.line()).arg(error.reason());
@@ -108,6 +115,20 @@ TEST_P(Import, Case) {
 
 INSTANTIATE_TEST_SUITE_P(Contacts, Import, ::testing::ValuesIn(cases("import/cases.txt")),
                          RowName());
+
+// What the importers' fuzz targets require of any input, over their seed files.
+TEST(Import, FuzzSeedsKeepTheFuzzProperties) {
+    for (const auto& [folder, parse] : {std::pair{"CsvFuzz", &CsvImporter::parse},
+                                        std::pair{"VCardFuzz", &VCardImporter::parse}}) {
+        const QDir seeds(PELMO_TEST_DATA "/fuzz/" + QLatin1String(folder));
+        ASSERT_FALSE(seeds.isEmpty());
+        for (const QString& name : seeds.entryList(QDir::Files)) {
+            QFile seed(seeds.filePath(name));
+            ASSERT_TRUE(seed.open(QIODevice::ReadOnly));
+            fuzz::checkImport(parse, seed.readAll());
+        }
+    }
+}
 
 // Persons as their contact lines, with the groups they are in; then each group and its members.
 QString dump(const AddressBook& book) {
@@ -177,15 +198,30 @@ QString apply(AddressBook& book, const QStringList& words) {
         AddressBook elsewhere(book.path());
         return apply(elsewhere, words.mid(1));
     }
-    if (op == "import") {
+    if (op == "import" || op == "importfile") {
         QList<ImportedContact> contacts;
         for (const QString& line : words.mid(1))
             contacts << contactOf(line);
-        const ImportSummary summary = book.add(contacts);
-        return QStringLiteral("%1 added, %2 known, %3 groups")
+        const ImportSummary summary = op == "import" ? book.add(contacts) : book.importFile(path);
+        return QStringLiteral("%1 added, %2 updated, %3 unchanged, %4 new groups")
             .arg(summary.personsAdded)
-            .arg(summary.personsKnown)
-            .arg(summary.groups);
+            .arg(summary.personsUpdated)
+            .arg(summary.personsUnchanged)
+            .arg(summary.groupsAdded);
+    }
+    if (op == "export")
+        return QString::number(book.exportFile(path, words.size() > 2 ? words[2] : QString()));
+    if (op == "dump")
+        return dump(book);
+    if (op == "find") {
+        QStringList names;
+        for (const Person& found : PersonFilter::filter(book.persons(), words.value(1)))
+            names << found.fullName();
+        return names.isEmpty() ? "none" : names.join(", ");
+    }
+    if (op == "into") { // on another book in the folder
+        AddressBook another(path);
+        return apply(another, words.mid(2));
     }
     if (op == "sql") { // straight to the file, past the book
         {

@@ -71,7 +71,7 @@ public:
             for (const QString& name : QDir(words[2]).entryList(QDir::Files, QDir::Name))
                 out += name + '\n' + outline(bytes(words[2] + '/' + name)) + '\n';
         } else if (what == "cat") {
-            out = QString::fromUtf8(bytes(words[2]));
+            out = QString::fromUtf8(bytes(words[2])).replace("\r", "\\r");
         } else if (what == "mode") {
             struct stat status {};
             out = ::stat(QFile::encodeName(words[2]).constData(), &status) == 0

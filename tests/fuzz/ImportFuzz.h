@@ -1,13 +1,14 @@
 #pragma once
 
 // The contacts-file importers on arbitrary bytes: a file is either refused with an ImportError
-// that names one of its lines, or gives contacts the address book takes as they are.
+// that names one of its lines, or gives contacts the address book takes as they are and
+// reports what it left out against lines of the file.
 
 #include "FuzzSupport.h"
 
 #include "addressbook/ImportError.h"
 #include "addressbook/ImportText.h"
-#include "addressbook/ImportedContact.h"
+#include "addressbook/ParsedContacts.h"
 
 #include <algorithm>
 
@@ -19,18 +20,24 @@ inline bool isCleanName(const QString& name) {
                         [](QChar c) { return c.category() == QChar::Other_Control; });
 }
 
-inline void checkImport(QList<ImportedContact> (*parse)(const QByteArray&),
-                        const QByteArray& bytes) {
-    QList<ImportedContact> contacts;
+inline void checkImport(ParsedContacts (*parse)(const QByteArray&), const QByteArray& bytes) {
+    // Every line break is one of these bytes in UTF-8, Windows-1252 and UTF-16 alike.
+    const qsizetype lines = bytes.count('\n') + bytes.count('\r') + 1;
+    ParsedContacts parsed;
     try {
-        contacts = parse(bytes);
+        parsed = parse(bytes);
     } catch (const ImportError& error) {
-        require(error.line() >= 0 && error.line() <= bytes.count('\n') + bytes.count('\r') + 1,
-                "the fault's line is not in the file");
+        require(error.line() >= 0 && error.line() <= lines, "the fault's line is not in the file");
         require(!error.reason().isEmpty(), "a fault without a reason");
         return;
     }
-    for (const ImportedContact& contact : std::as_const(contacts)) {
+    for (const SkippedValue& skipped : std::as_const(parsed.skipped)) {
+        require(skipped.line >= 1 && skipped.line <= lines, "a skipped value's line is not in "
+                                                            "the file");
+        require(!skipped.reason.isEmpty(), "a value skipped without a reason");
+    }
+    require(parsed.contactsSkipped <= parsed.skipped.size(), "a contact left out unreported");
+    for (const ImportedContact& contact : std::as_const(parsed.contacts)) {
         const Person& person = contact.person;
         require(!person.fullName().isEmpty() || !person.emails.isEmpty(),
                 "a contact with neither a name nor an address");
