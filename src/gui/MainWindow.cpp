@@ -245,6 +245,19 @@ void MainWindow::createActions() {
     m_fileMenu->addAction(preferences);
     m_fileMenu->addAction(makeDefault);
     m_fileMenu->addSeparator();
+    auto* importContacts =
+        m_fileMenu->addAction(LocalizedStringNS("Import Contacts…"), this, [this] {
+            showPeoplePicker();
+            m_picker->importContacts();
+        });
+    importContacts->setObjectName(QStringLiteral("importContactsAction"));
+    auto* exportContacts =
+        m_fileMenu->addAction(LocalizedStringNS("Export Contacts…"), this, [this] {
+            showPeoplePicker();
+            m_picker->exportContacts();
+        });
+    exportContacts->setObjectName(QStringLiteral("exportContactsAction"));
+    m_fileMenu->addSeparator();
     m_fileMenu->addAction(quit);
     m_quitAction = quit;
     menuBar()->addMenu(LocalizedStringNS("&Message"))->addAction(send);

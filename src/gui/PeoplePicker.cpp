@@ -1,21 +1,28 @@
 #include "gui/PeoplePicker.h"
 
 #include "addressbook/AddressBook.h"
+#include "addressbook/PersonFilter.h"
 #include "gui/AlertBox.h"
+#include "gui/ContactFiles.h"
 #include "gui/PersonDialog.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
 
 #include <QCollator>
+#include <QDragEnterEvent>
+#include <QDropEvent>
 #include <QEvent>
 #include <QFileSystemWatcher>
 #include <QHBoxLayout>
 #include <QInputDialog>
 #include <QLabel>
+#include <QLineEdit>
 #include <QListWidget>
 #include <QMenu>
 #include <QMessageBox>
+#include <QMimeData>
 #include <QPushButton>
+#include <QSet>
 #include <QSignalBlocker>
 #include <QSplitter>
 #include <QTimer>
@@ -67,7 +74,7 @@ PeoplePicker::PeoplePicker(AddressBook& addressBook, QWidget* parent)
     : QWidget(parent, Qt::Window), m_book(addressBook),
       m_groups(list("groups", QAbstractItemView::ExtendedSelection)),
       m_persons(list("persons", QAbstractItemView::ExtendedSelection)),
-      m_addresses(list("addresses", QAbstractItemView::SingleSelection)) {
+      m_addresses(list("addresses", QAbstractItemView::SingleSelection)), m_search(new QLineEdit) {
     setWindowTitle(LocalizedStringNS("Addresses"));
     setAttribute(Qt::WA_QuitOnClose, false);
     auto* splitter = new QSplitter;
@@ -79,7 +86,16 @@ PeoplePicker::PeoplePicker(AddressBook& addressBook, QWidget* parent)
     auto* hint = new QLabel(LocalizedStringNS(
         "Choose a group to mail each of its members, or a person to mail one message."));
     hint->setWordWrap(true);
+    m_search->setObjectName(QStringLiteral("search"));
+    m_search->setPlaceholderText(LocalizedStringNS("Search names and addresses"));
+    m_search->setClearButtonEnabled(true);
+    connect(m_search, &QLineEdit::textChanged, this, [this] {
+        fillPersons(selectedRecords());
+        updateButtons();
+    });
+    setAcceptDrops(true);
     auto* layout = new QVBoxLayout(this);
+    layout->addWidget(m_search);
     layout->addWidget(splitter, 1);
     layout->addWidget(hint);
 
@@ -199,6 +215,7 @@ bool PeoplePicker::eventFilter(QObject* watched, QEvent* event) {
 }
 
 void PeoplePicker::groupsChosen() {
+    listPersons();
     fillPersons({});
     updateButtons();
     Q_EMIT groupSelectionChanged(selectedGroups(), isActiveWindow());
@@ -241,6 +258,7 @@ void PeoplePicker::reload() {
     for (int row = 0; row < m_addresses->count(); ++row)
         shownBefore << m_addresses->item(row)->text();
     fillGroups(groups);
+    listPersons();
     fillPersons(persons);
     fillAddresses(values.value(0));
     updateButtons();
@@ -263,26 +281,34 @@ void PeoplePicker::fillGroups(const QList<qint64>& selected) {
     }
 }
 
-void PeoplePicker::fillPersons(const QList<qint64>& selected) {
-    const QSignalBlocker blocker(m_persons);
-    m_persons->clear();
+void PeoplePicker::listPersons() {
     const qint64 group = shownGroup();
-    QList<Person> persons =
-        group == 0 ? m_book.persons() : m_book.members(group).value_or(QList<Person>());
+    m_listed = group == 0 ? m_book.persons() : m_book.members(group).value_or(QList<Person>());
     // A group's members in the order of the whole book, though they are mailed in the group's.
     QCollator collator;
     collator.setCaseSensitivity(Qt::CaseInsensitive);
-    std::stable_sort(persons.begin(), persons.end(),
+    std::stable_sort(m_listed.begin(), m_listed.end(),
                      [&collator](const Person& one, const Person& other) {
                          if (const int last = collator.compare(one.lastName, other.lastName))
                              return last < 0;
                          return collator.compare(one.firstName, other.firstName) < 0;
                      });
-    for (const Person& person : persons) {
-        auto* item = new QListWidgetItem(shownName(person), m_persons);
+}
+
+// Runs on every key press in the search field: only the filter and the list, never the book.
+void PeoplePicker::fillPersons(const QList<qint64>& selected) {
+    const QSignalBlocker blocker(m_persons);
+    m_persons->setUpdatesEnabled(false);
+    m_persons->clear();
+    const QSet<qint64> chosen(selected.cbegin(), selected.cend());
+    for (const Person& person : PersonFilter::filter(m_listed, m_search->text())) {
+        auto* item = new QListWidgetItem(shownName(person));
         item->setData(kIdRole, person.id);
-        item->setSelected(selected.contains(person.id));
+        m_persons->addItem(item);
+        if (chosen.contains(person.id))
+            item->setSelected(true);
     }
+    m_persons->setUpdatesEnabled(true);
 }
 
 void PeoplePicker::fillAddresses(const QString& selected) {
@@ -316,6 +342,42 @@ void PeoplePicker::updateButtons() {
     m_editPerson->setEnabled(selectedRecords().size() == 1);
     m_deletePerson->setEnabled(persons);
     m_groupsOfPerson->setEnabled(persons);
+}
+
+// Contact files
+
+void PeoplePicker::importContacts() {
+    ContactFiles::chooseAndImport(this, m_book, [this] { reload(); });
+}
+
+void PeoplePicker::exportContacts() {
+    const std::optional<Group> shown = m_book.group(shownGroup());
+    ContactFiles::chooseAndExport(this, m_book, shown ? shown->name : QString());
+}
+
+namespace {
+
+QStringList droppedContactFiles(const QMimeData* data) {
+    QStringList paths;
+    for (const QUrl& url : data->urls())
+        if (url.isLocalFile() && ContactFiles::isContactsFile(url.toLocalFile()))
+            paths << url.toLocalFile();
+    return paths;
+}
+
+} // namespace
+
+void PeoplePicker::dragEnterEvent(QDragEnterEvent* event) {
+    if (!droppedContactFiles(event->mimeData()).isEmpty())
+        event->acceptProposedAction();
+}
+
+void PeoplePicker::dropEvent(QDropEvent* event) {
+    const QStringList paths = droppedContactFiles(event->mimeData());
+    if (paths.isEmpty())
+        return;
+    event->acceptProposedAction();
+    ContactFiles::importFiles(this, m_book, paths, [this] { reload(); });
 }
 
 // Editing the book

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "addressbook/Person.h"
+
 #include <QList>
 #include <QStringList>
 #include <QWidget>
@@ -8,14 +10,18 @@
 
 class AddressBook;
 class PelmoException;
+class QDragEnterEvent;
+class QDropEvent;
+class QLineEdit;
 class QListWidget;
 class QMenu;
 class QPushButton;
 
 /**
  * The address-book window: the groups (and "All"), the persons of the first selected group or
- * of the whole book, and the addresses of the first selected person. It also edits the book:
- * persons, groups and memberships.
+ * of the whole book that match the search field, and the addresses of the first selected
+ * person. It also edits the book (persons, groups and memberships) and imports the contact
+ * files dropped on it.
  *
  * A change of selection made by the user is announced by one of four signals, each carrying
  * whether this window was the active (key) window at the time, so that only a choice made
@@ -37,6 +43,10 @@ public:
     QStringList selectedValues() const;
     /** Reads the book again, keeping the selection where its groups and persons remain. */
     void reload();
+    /** Asks for vCard or CSV files and imports them, with a summary. */
+    void importContacts();
+    /** Asks where to write the group shown, or everyone, as a vCard file. */
+    void exportContacts();
 
 Q_SIGNALS:
     void groupSelectionChanged(const QList<qint64>& groupIds, bool pickerIsKeyWindow);
@@ -49,6 +59,9 @@ Q_SIGNALS:
 
 protected:
     bool eventFilter(QObject* watched, QEvent* event) override;
+    /** Contact files dropped on the window are imported. */
+    void dragEnterEvent(QDragEnterEvent* event) override;
+    void dropEvent(QDropEvent* event) override;
 
 private:
     void watchBook();
@@ -64,6 +77,8 @@ private:
     void personsChosen();
     void addressChosen();
     void fillGroups(const QList<qint64>& selected);
+    /** Reads the persons of the group shown, or of the whole book, in name order. */
+    void listPersons();
     void fillPersons(const QList<qint64>& selected);
     void fillAddresses(const QString& selected);
     void updateButtons();
@@ -89,6 +104,9 @@ private:
     QListWidget* m_groups;
     QListWidget* m_persons;
     QListWidget* m_addresses;
+    QLineEdit* m_search;
+    /** The persons of the group shown, before the search. */
+    QList<Person> m_listed;
     QMenu* m_membership = nullptr;
     QPushButton* m_renameGroup = nullptr;
     QPushButton* m_deleteGroup = nullptr;

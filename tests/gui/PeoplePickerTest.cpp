@@ -2,8 +2,12 @@
 #include "controller/RecipientSelection.h"
 #include "gui/PersonDialog.h"
 
+#include <QDir>
+#include <QDropEvent>
+#include <QFileDialog>
 #include <QInputDialog>
 #include <QMenu>
+#include <QMimeData>
 #include <QSignalSpy>
 #include <QTableWidget>
 
@@ -177,6 +181,52 @@ TEST_F(Picker, ThePersonDialogSavesOnlyWhatTheBookTakes) {
     dialog->accept();
     EXPECT_EQ(rows("persons") + " / " + book->person(dee.id)->primaryEmail(),
               "Cy Cole / dee@example.org");
+}
+
+// The search keeps the persons any part of whose names or addresses holds every word typed.
+// Files dropped on the window are imported, each with its counts and what it left out;
+// File ▸ Export Contacts… writes the group shown.
+TEST_F(Picker, SearchDropAndExport) {
+    for (const auto& [query, shown] : {std::pair{"", "Ann Able, Bob Baker, Cy Cole"},
+                                       {"work.EXAMPLE", "Ann Able"},
+                                       {"bak example.org", "Bob Baker"},
+                                       {"zed", ""}}) {
+        child<QLineEdit>("search", &picker())->setText(query);
+        EXPECT_EQ(rows("persons"), shown) << query;
+    }
+    child<QLineEdit>("search", &picker())->clear();
+
+    QMimeData files;
+    files.setUrls({QUrl::fromLocalFile(PELMO_TEST_DATA "/import/bad-values.vcf"),
+                   QUrl::fromLocalFile(PELMO_TEST_DATA "/import/sniffed.txt"),
+                   QUrl::fromLocalFile(PELMO_TEST_DATA "/import/halfway.csv")});
+    QDragEnterEvent enter(QPoint(10, 10), Qt::CopyAction, &files, Qt::LeftButton, {});
+    QDropEvent drop(QPointF(10, 10), Qt::CopyAction, &files, Qt::LeftButton, {});
+    QCoreApplication::sendEvent(&picker(), &enter);
+    QCoreApplication::sendEvent(&picker(), &drop);
+    auto* summary = picker().findChild<QMessageBox*>("importSummary");
+    ASSERT_NE(summary, nullptr);
+    // Only the contact files: a .txt dropped with them is not imported.
+    EXPECT_EQ(summary->text(),
+              "Imported bad-values.vcf: 2 persons added, 0 updated, 1 skipped; 1 new group.\n"
+              "Imported halfway.csv: 2 persons added, 0 updated, 1 skipped; 0 new groups.");
+    EXPECT_EQ(summary->detailedText().count('\n') + 1, 4);
+    EXPECT_TRUE(summary->detailedText().startsWith(
+        "bad-values.vcf, line 5: \"ada at work\" is not an e-mail address (skipped)"));
+    summary->accept();
+    EXPECT_EQ(rows("persons"),
+              "Ann Able, Bob Baker, Cy Cole, Irene Curie, Marie Curie, Ada Lovelace, Alan Turing");
+
+    clickRow(list("groups"), "Club");
+    child<QAction>("exportContactsAction")->trigger();
+    auto* dialog = asked<QFileDialog>();
+    ASSERT_NE(dialog, nullptr);
+    const QString path = QDir(folder.path()).filePath("club.vcf");
+    dialog->selectFile(path);
+    QMetaObject::invokeMethod(dialog, "accept");
+    AddressBook back(QDir(folder.path()).filePath("back.sqlite"));
+    EXPECT_EQ(back.importFile(path).headline("club.vcf"),
+              "Imported club.vcf: 2 persons added, 0 updated, 0 skipped; 1 new group.");
 }
 
 // A person another program adds to the same file shows without a restart.
