@@ -118,7 +118,6 @@ QVariant MailSettings::value(Key key) {
     const auto overridden = overrides.constFind(name(key));
     if (overridden != overrides.constEnd())
         return overridden.value();
-    store.sync();
     return store.value(name(key));
 }
 

@@ -13,8 +13,9 @@
  * controller, the preferences and `pelmo send --set` read and write through it, so a key is
  * spelled here and nowhere else.
  *
- * Every read first syncs the store, so that a change the preferences (or another process) just
- * saved is seen by the next message. A value overridden for this process (a command-line run
+ * Reads come from memory; the mailing run syncs the store before each message, so that a
+ * change another process just saved is seen by the next message, as one the preferences make
+ * in this process is at once. A value overridden for this process (a command-line run
  * with another server) wins over the stored one and is never written. The settings folder and
  * file are kept private to the user (0700, 0600), as they may hold the password.
  */
@@ -51,7 +52,7 @@ public:
     /** The value a form shows for a key that is not stored (port 25); invalid for none. */
     static QVariant suggested(Key key);
 
-    /** The overridden value, else the stored one (synced first); invalid when neither. */
+    /** The overridden value, else the stored one; invalid when neither. */
     QVariant value(Key key);
     bool contains(Key key);
     /** A string setting; null when missing. A list (an unquoted comma) reads joined. */

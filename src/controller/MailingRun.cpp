@@ -92,7 +92,6 @@ void MailingRun::beginDeliveries() {
     m_stopSending = false;
     enter(State::Delivering);
     status(LocalizedStringNS("Sending mail."));
-    m_parts.settings.sync();
     if (const auto& people = m_parts.selection.getPeople()) {
         m_parts.view.setProgressCounting(0.0, static_cast<double>(people->size()), 0.0);
         sendMember();
@@ -132,6 +131,8 @@ void MailingRun::deliver() {
     status(LocalizedStringNS("[Mailing started at ") + now() + LocalizedStringNS("]"));
     if (!m_parts.selection.getPeople())
         m_parts.view.startProgressAnimation();
+    // What another process saved since the last copy counts for this one.
+    m_parts.settings.sync();
     DeliveryRequest request;
     try {
         request = buildRequest();

@@ -87,10 +87,23 @@ const char* charsetParameter(int characterSetIndex) {
 }
 
 // RFC 2046 4.1.1: text travels with CRLF line breaks, whatever the editor or page used.
-QString withCrlfLineEnds(QString text) {
-    text.replace(QLatin1String("\r\n"), QLatin1String("\n"));
-    text.replace(QLatin1Char('\r'), QLatin1Char('\n'));
-    return text.replace(QLatin1Char('\n'), QLatin1String("\r\n"));
+// Every copy passes through here: one pass that copies the runs between line ends whole.
+QString withCrlfLineEnds(const QString& text) {
+    QString out;
+    out.reserve(text.size() + text.size() / 32);
+    qsizetype done = 0;
+    for (qsizetype at = 0; at < text.size(); ++at) {
+        const QChar c = text.at(at);
+        if (c != QLatin1Char('\r') && c != QLatin1Char('\n'))
+            continue;
+        out += QStringView(text).mid(done, at - done);
+        out += QLatin1String("\r\n");
+        if (c == QLatin1Char('\r') && at + 1 < text.size() && text.at(at + 1) == QLatin1Char('\n'))
+            ++at;
+        done = at + 1;
+    }
+    out += QStringView(text).mid(done);
+    return out;
 }
 
 // RFC 2047 2, 4.2, 5: the subject in "Q" encoded words of whole characters, each on a line of

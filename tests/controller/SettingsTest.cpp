@@ -1,4 +1,5 @@
 #include "ControllerFixture.h"
+#include "ScriptedSession.h"
 
 #include "controller/SentRecipients.h"
 #include "util/PelmoException.h"
@@ -32,18 +33,28 @@ TEST_F(ControllerFixture, PortIsOneTo65365) {
     }
 }
 
-// The preferences of another process rewrite the file; the next read must see it.
-TEST_F(ControllerFixture, EveryReadSyncsFirst) {
+// The preferences of another process rewrite the file; the next message must go by it.
+TEST_F(ControllerFixture, TheNextMessageSeesWhatAnotherProcessSaved) {
     set("serverAddress", QStringLiteral("old.example.org"));
     EXPECT_EQ(controller->getServer(), QStringLiteral("old.example.org"));
     QFile rewrite(settings().fileName());
     ASSERT_TRUE(rewrite.open(QIODevice::WriteOnly | QIODevice::Truncate));
-    rewrite.write("[General]\nserverAddress=new.example.org\n");
+    rewrite.write("[General]\nserverAddress=new.example.org\nsenderEmail=me@example.org\n"
+                  "senderName=Me\nserverPort=25\n");
     rewrite.close();
     ASSERT_TRUE(rewrite.open(QIODevice::ReadWrite));
     rewrite.setFileTime(QDateTime::currentDateTime().addSecs(5), QFileDevice::FileModificationTime);
     rewrite.close();
-    EXPECT_EQ(controller->getServer(), QStringLiteral("new.example.org"));
+    QString opened;
+    QStringList transcript;
+    controller->setSessionFactory([&](const QString& host, int) -> SmtpSession* {
+        opened = host;
+        return new ScriptedSession({}, transcript);
+    });
+    view.toText = QStringLiteral("ann@example.org");
+    view.nameText = QStringLiteral("Ann");
+    runUntilSettled();
+    EXPECT_EQ(opened, QStringLiteral("new.example.org"));
 }
 
 // The file may hold the password: nobody else may read it, also after an older Pelmo or an
