@@ -1,6 +1,12 @@
 #include "relink/SuffixMap.h"
 
+#include <QDateTime>
+#include <QDir>
+#include <QFile>
+#include <QFileInfo>
 #include <QMimeDatabase>
+#include <QSaveFile>
+#include <QStandardPaths>
 
 #include <algorithm>
 #include <cctype>
@@ -57,7 +63,71 @@ void EnsureSuffixMap() {
         InitializeSuffixMap();
 }
 
-void InitializeSuffixMap() {
+namespace {
+
+// Reading every type's globs parses the whole MIME database, most of a short command's time,
+// so the map is kept in the user's cache and built again only when the database changes:
+// update-mime-database rewrites mime.cache, and adding or removing a package touches its folder.
+QString databaseStamp() {
+    QStringList parts{QStringLiteral("pelmo suffix map 1")};
+    for (const QString& folder :
+         QStandardPaths::locateAll(QStandardPaths::GenericDataLocation, QStringLiteral("mime"),
+                                   QStandardPaths::LocateDirectory))
+        for (const char* name : {"mime.cache", "packages"}) {
+            const QFileInfo part(folder + QLatin1Char('/') + QLatin1String(name));
+            parts << part.filePath() + QLatin1Char(' ') +
+                         QString::number(part.exists() ? part.lastModified().toMSecsSinceEpoch()
+                                                       : 0);
+        }
+    return parts.join(QLatin1Char('\n')) + QLatin1String("\n\n");
+}
+
+QString cachePath() {
+    return QStandardPaths::writableLocation(QStandardPaths::GenericCacheLocation) +
+           QLatin1String("/pelmo/suffix-map");
+}
+
+void insertEntry(const QByteArray& extension, const QByteArray& mimeType) {
+    ICMapEntry entry{};
+    entry.fileType = fileTypeFor(extension.mid(1));
+    copyTruncated(entry.extension, sizeof entry.extension, extension);
+    copyTruncated(entry.MIMEType, sizeof entry.MIMEType, mimeType);
+    if (Link<CString256, ICMapEntry>* record =
+            gSuffixMap.insert(CString256(extension.constData()), entry))
+        record->value = entry;
+}
+
+// The cache: the stamp, then one "suffix TAB type" line an entry, in the map's order.
+bool loadCached(const QByteArray& stamp) {
+    QFile file(cachePath());
+    if (!file.open(QIODevice::ReadOnly) || file.read(stamp.size()) != stamp)
+        return false;
+    const QList<QByteArray> lines = file.readAll().split('\n');
+    for (const QByteArray& line : lines) {
+        const qsizetype tab = line.indexOf('\t');
+        if (tab > 0)
+            insertEntry(line.left(tab), line.mid(tab + 1));
+    }
+    return gSuffixMap.count > 0;
+}
+
+// A cache that cannot be written costs only time at the next start.
+void saveCache(const QByteArray& stamp) {
+    const QString path = cachePath();
+    if (!QDir().mkpath(QFileInfo(path).path()))
+        return;
+    QSaveFile file(path);
+    if (!file.open(QIODevice::WriteOnly))
+        return;
+    file.write(stamp);
+    for (const elem<Link<CString256, ICMapEntry>*>* row = gSuffixMap.list.first; row;
+         row = row->next)
+        file.write(QByteArray(row->data->value.extension) + '\t' + row->data->value.MIMEType +
+                   '\n');
+    file.commit();
+}
+
+void buildFromDatabase() {
     const QMimeDatabase database;
     QList<QMimeType> types = database.allMimeTypes();
     // Name order keeps the map's insertion order the same from run to run.
@@ -74,13 +144,17 @@ void InitializeSuffixMap() {
                                           .mimeTypeForFile(QLatin1String("x") + glob.mid(1),
                                                            QMimeDatabase::MatchExtension)
                                           .name();
-            ICMapEntry entry{};
-            entry.fileType = fileTypeFor(extension.mid(1));
-            copyTruncated(entry.extension, sizeof entry.extension, extension);
-            copyTruncated(entry.MIMEType, sizeof entry.MIMEType, preferred.toLatin1());
-            if (Link<CString256, ICMapEntry>* record =
-                    gSuffixMap.insert(CString256(extension.constData()), entry))
-                record->value = entry;
+            insertEntry(extension, preferred.toLatin1());
         }
     }
+}
+
+} // namespace
+
+void InitializeSuffixMap() {
+    const QByteArray stamp = databaseStamp().toUtf8();
+    if (loadCached(stamp))
+        return;
+    buildFromDatabase();
+    saveCache(stamp);
 }

@@ -4,7 +4,10 @@
 #include "relink/Relink.h"
 #include "relink/SuffixMap.h"
 
+#include <QFile>
+#include <QStandardPaths>
 #include <gtest/gtest.h>
+
 
 #include <fstream>
 #include <sstream>
@@ -122,6 +125,38 @@ TEST(Relink, GeneratedPagesAsByThePlainAlgorithm) {
         ASSERT_EQ(fast, outcome(CString256(bases[seed % 6]), page, true)) << "seed " << seed;
         EXPECT_NE(fast[0], page) << "seed " << seed;
     }
+}
+
+// The map is built from the MIME database once and read from the user's cache after: both
+// give the same entries in the same order, and a cache of another database is not used.
+TEST(Relink, SuffixMapFromTheCacheIsTheMapBuilt) {
+    const auto snapshot = [] {
+        std::vector<std::string> rows;
+        for (const elem<Link<CString256, ICMapEntry>*>* row = gSuffixMap.list.first; row;
+             row = row->next)
+            rows.push_back(std::string(row->data->key.c_str()) + " " +
+                           row->data->value.MIMEType + " " +
+                           std::to_string(row->data->value.fileType));
+        return rows;
+    };
+    QFile cache(QStandardPaths::writableLocation(QStandardPaths::GenericCacheLocation) +
+                "/pelmo/suffix-map");
+    cache.remove();
+    gSuffixMap.clear();
+    InitializeSuffixMap();
+    const std::vector<std::string> built = snapshot();
+    ASSERT_TRUE(cache.exists());
+    ASSERT_GT(built.size(), 500u);
+    gSuffixMap.clear();
+    InitializeSuffixMap();
+    EXPECT_EQ(snapshot(), built);
+
+    ASSERT_TRUE(cache.open(QIODevice::WriteOnly));
+    cache.write("pelmo suffix map 1\n/elsewhere/mime 1\n\n.zzz\tapplication/x-made-up\n");
+    cache.close();
+    gSuffixMap.clear();
+    InitializeSuffixMap();
+    EXPECT_EQ(snapshot(), built);
 }
 
 } // namespace
