@@ -181,10 +181,12 @@ SmtpClient::~SmtpClient() {
 
 QSslConfiguration SmtpClient::tlsConfiguration() {
     QSslConfiguration configuration = QSslConfiguration::defaultConfiguration();
+    // The cached list holds the system's certificates already: asking the configuration for
+    // its own would read the whole system store again for every connection.
     const QList<QSslCertificate> trusted =
         caCertificates(qEnvironmentVariable("SSL_CERT_FILE"), qEnvironmentVariable("SSL_CERT_DIR"));
     if (!trusted.isEmpty())
-        configuration.setCaCertificates(configuration.caCertificates() + trusted);
+        configuration.setCaCertificates(trusted);
     return configuration;
 }
 
@@ -365,6 +367,10 @@ void SmtpClient::forgetCredentials() {
 void SmtpClient::onConnected() {
     if (m_state != State::Connecting)
         return;
+    // Every command goes in one write and waits for its reply: holding a small segment back
+    // for an acknowledgement (Nagle) only adds a delayed ACK's wait, after the TLS handshake
+    // above all.
+    m_socket->setSocketOption(QAbstractSocket::LowDelayOption, 1);
     notify(&SmtpSession::connectionEstablished);
     enter(m_implicitTLS ? State::AwaitingSSL : State::Greeting);
 }
