@@ -5,6 +5,8 @@
 
 #include <QTextDocument>
 
+#include <random>
+
 namespace {
 
 class Tags : public ControllerFixture {
@@ -55,6 +57,36 @@ TEST_F(Tags, Replaced) {
     set("senderName", QStringLiteral("Me"));
     controller->message()->setPlainText(QStringLiteral("Hello {toName},\nsee you.\n{fromName}"));
     EXPECT_EQ(content().getMessage(), QStringLiteral("Hello Ada Lovelace,\nsee you.\nMe"));
+}
+
+// Against the plain rule, a case-insensitive replace of each tag in turn, over texts and values
+// made of tags, their pieces and stray braces: the scan for braces must give the same copies.
+TEST_F(Tags, SameAsReplacingEachTagInTurn) {
+    const QStringList pieces = {"{",        "}",      "{to}",       "{TO}",      "{toName}",
+                                "{toname}", "{from}", "{fromName}", "{subject}", "{Subject}",
+                                "to",       "Name",   "x",          " "};
+    std::mt19937 random(7);
+    const auto made = [&](int size) {
+        QString text;
+        for (int i = 0; i < size; ++i)
+            text += pieces[random() % pieces.size()];
+        return text;
+    };
+    for (int round = 0; round < 300; ++round) {
+        view.toText = "a" + made(2);
+        view.nameText = made(3);
+        view.subjectText = made(3);
+        set("senderName", "M" + made(2));
+        const QString text = made(12);
+        QString expected = text;
+        for (const auto& [tag, value] : {std::pair{"{to}", view.toText},
+                                         {"{toName}", view.nameText},
+                                         {"{from}", QStringLiteral("me@example.org")},
+                                         {"{fromName}", settings().value("senderName").toString()},
+                                         {"{subject}", view.subjectText}})
+            expected.replace(QLatin1String(tag), value, Qt::CaseInsensitive);
+        ASSERT_EQ(content().replaceTags(text), expected) << text.toStdString();
+    }
 }
 
 // The tags' values come from the fields and settings, so they may hold characters the set
