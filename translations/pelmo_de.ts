@@ -213,11 +213,11 @@
     </message>
     <message>
         <source>1 recipient to mail</source>
-        <translation>1 Empfänger anzuschreiben</translation>
+        <translation>1 Empfänger ausstehend</translation>
     </message>
     <message>
         <source>%1 recipients to mail</source>
-        <translation>%1 Empfänger anzuschreiben</translation>
+        <translation>%1 Empfänger ausstehend</translation>
     </message>
     <message>
         <source>1 member</source>

@@ -213,11 +213,11 @@
     </message>
     <message>
         <source>1 recipient to mail</source>
-        <translation>1 destinataire à qui écrire</translation>
+        <translation>1 destinataire à contacter</translation>
     </message>
     <message>
         <source>%1 recipients to mail</source>
-        <translation>%1 destinataires à qui écrire</translation>
+        <translation>%1 destinataires à contacter</translation>
     </message>
     <message>
         <source>1 member</source>

@@ -15,6 +15,7 @@ translations.
 """
 
 import argparse
+import html
 import os
 import re
 import shutil
@@ -22,7 +23,6 @@ import subprocess
 import sys
 import tempfile
 import xml.etree.ElementTree as ElementTree
-from xml.sax.saxutils import unescape
 
 HERE = os.path.dirname(os.path.abspath(__file__))
 SOURCES = os.path.join(os.path.dirname(HERE), "src")
@@ -49,7 +49,7 @@ def keys_in_sources(lupdate, scratch):
     with open(ids_ts, encoding="utf-8") as ts:
         found = re.findall(r'^\s*<message id="(.*?)"(?: numerus="yes")?>$', ts.read(), re.MULTILINE)
     keys = []
-    for key in (unescape(key, {"&quot;": "\"", "&apos;": "'"}) for key in found):
+    for key in map(html.unescape, found):
         if key not in keys:
             keys.append(key)
     return keys
@@ -90,7 +90,9 @@ def problems(ts_file, report):
 def main():
     parser = argparse.ArgumentParser(description=__doc__.splitlines()[0])
     parser.add_argument("--check", action="store_true")
-    parser.add_argument("--lupdate", default=shutil.which("lupdate") or "/usr/lib/qt6/bin/lupdate")
+    # Debian keeps Qt 6's lupdate out of PATH, where a Qt 5 one may stand.
+    qt6 = "/usr/lib/qt6/bin/lupdate"
+    parser.add_argument("--lupdate", default=qt6 if os.path.exists(qt6) else shutil.which("lupdate"))
     parser.add_argument("ts", nargs="+")
     arguments = parser.parse_args()
     with tempfile.TemporaryDirectory() as scratch:
