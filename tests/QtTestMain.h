@@ -4,11 +4,14 @@
 #include <QTemporaryDir>
 #include <gtest/gtest.h>
 
+#include <functional>
+
 // Runs the tests inside an App (QGuiApplication, QApplication) on the offscreen platform, with
 // the configuration and data homes in a temporary folder. QSettings fixes its folders on first
-// use, so they are set before the application exists.
+// use, so they are set before the application exists. started runs once the application
+// exists, before any test.
 template <class App>
-int runTestsIn(int argc, char** argv) {
+int runTestsIn(int argc, char** argv, const std::function<void()>& started = {}) {
     QTemporaryDir home;
     if (!home.isValid())
         return 1;
@@ -18,6 +21,8 @@ int runTestsIn(int argc, char** argv) {
     if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM"))
         qputenv("QT_QPA_PLATFORM", "offscreen");
     App app(argc, argv);
+    if (started)
+        started();
     ::testing::InitGoogleTest(&argc, argv);
     return RUN_ALL_TESTS();
 }

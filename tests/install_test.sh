@@ -1,7 +1,7 @@
 #!/bin/sh
 # Catches a desktop entry the desktop tools reject, and install rules that leave out a file the
-# desktop, man or Help looks for, or that ignore DESTDIR; with --deb, the same of the Debian
-# package that cpack makes of the build, and a package of some other version.
+# desktop, man, Help or the translations look for, or that ignore DESTDIR; with --deb, the same
+# of the Debian package that cpack makes of the build, and a package of some other version.
 # usage: install_test.sh SOURCE-DIR BUILD-DIR VERSION [--deb]
 set -eu
 source=$1 build=$2 version=$3
@@ -30,6 +30,17 @@ check_tree() {
   done
   gzip -dc "$tree/share/man/man1/pelmo.1.gz" | grep -q "^\.TH PELMO 1 .*\"Pelmo $version\"" ||
     fail "no manual page of Pelmo $version in $tree/share/man/man1"
+  # The translations, where the program finds them by their path from its own folder.
+  for language in de fr; do
+    cmp "$build/src/translations/pelmo_$language.qm" "$tree/share/pelmo/translations/pelmo_$language.qm"
+  done
+  home=$(mktemp -d -p "$stage")
+  said=$(HOME=$home XDG_DATA_HOME=$home/data XDG_CONFIG_HOME=$home/config LC_ALL= LANGUAGE= \
+    LANG=de_DE.UTF-8 "$tree/bin/pelmo" contacts list --group Keine 2>&1 || true)
+  case $said in
+    *"hat keine Gruppe"*) ;;
+    *) fail "$tree/bin/pelmo does not speak German: $said" ;;
+  esac
   cmp "$source/README.md" "$tree/share/doc/pelmo/README.md"
   cmp "$source/packaging/copyright" "$tree/share/doc/pelmo/copyright"
   gzip -dc "$tree/share/doc/pelmo/changelog.gz" | head -n 1 | grep -q "^pelmo ($version) " ||

@@ -77,7 +77,8 @@ private:
             endRecord();
         } else if (c == QLatin1Char('"')) {
             if (state == AfterQuote || !field.trimmed().isEmpty()) {
-                markFault("a double quote stands inside a field that does not begin with one");
+                markFault(LocalizedKey(
+                    "a double quote stands inside a field that does not begin with one"));
                 return;
             }
             field.clear();
@@ -86,7 +87,7 @@ private:
             state = Quoted;
         } else if (state == AfterQuote) {
             if (!c.isSpace())
-                markFault("text follows the closing quote of a field");
+                markFault(LocalizedKey("text follows the closing quote of a field"));
         } else {
             field += c;
             state = Unquoted;

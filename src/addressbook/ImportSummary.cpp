@@ -11,15 +11,17 @@ QString counted(int count, const char* one, const char* many) {
 } // namespace
 
 QString ImportSummary::headline(const QString& fileName) const {
-    QString line = LocalizedString("Imported %1: %2 added, %3 updated, %4 skipped; %5.")
-                       .arg(fileName, counted(personsAdded, "person", "persons"))
-                       .arg(personsUpdated)
-                       .arg(personsSkipped)
-                       .arg(counted(groupsAdded, "new group", "new groups"));
+    QString line =
+        LocalizedString("Imported %1: %2 added, %3 updated, %4 skipped; %5.")
+            .arg(fileName, counted(personsAdded, LocalizedKey("person"), LocalizedKey("persons")))
+            .arg(personsUpdated)
+            .arg(personsSkipped)
+            .arg(counted(groupsAdded, LocalizedKey("new group"), LocalizedKey("new groups")));
     if (personsUnchanged > 0)
-        line += QLatin1Char(' ') + LocalizedString("%1 already in the address book as in the "
-                                                   "file.")
-                                       .arg(counted(personsUnchanged, "was", "were"));
+        line += QLatin1Char(' ') +
+                LocalizedString("%1 already in the address book as in the "
+                                "file.")
+                    .arg(counted(personsUnchanged, LocalizedKey("was"), LocalizedKey("were")));
     return line;
 }
 

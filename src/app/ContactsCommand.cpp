@@ -96,7 +96,8 @@ int exportContacts(const QString& path, const QString& groupName) {
         return noSuchGroup(book, groupName);
     const int written = book.exportFile(path, groupName);
     QTextStream(stdout) << LocalizedString("Exported %1 to %2.")
-                               .arg(counted(written, "person", "persons"),
+                               .arg(counted(written, LocalizedKey("person"),
+                                            LocalizedKey("persons")),
                                     QFileInfo(path).fileName())
                         << '\n';
     return 0;

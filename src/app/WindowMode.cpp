@@ -11,6 +11,7 @@
 #include "util/AppIdentity.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
+#include "util/Translations.h"
 
 #include <QApplication>
 #include <QLockFile>
@@ -82,6 +83,7 @@ int startWindow(int argc, char** argv, const QString& link) {
     }
     QApplication app(argc, argv);
     nameApplication();
+    installTranslations(QLocale::system());
     QGuiApplication::setDesktopFileName(QStringLiteral("pelmo"));
     SingleInstance instance;
     if (!instance.listen())

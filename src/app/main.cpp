@@ -1,5 +1,6 @@
 #include "app/Commands.h"
 #include "app/WindowMode.h"
+#include "util/Translations.h"
 
 #include <QCoreApplication>
 #include <QGuiApplication>
@@ -26,5 +27,6 @@ int main(int argc, char** argv) {
         app = std::make_unique<QCoreApplication>(argc, argv);
     }
     nameApplication();
+    installTranslations(QLocale::system());
     return Commands::run(QCoreApplication::arguments().mid(1));
 }

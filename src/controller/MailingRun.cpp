@@ -64,13 +64,13 @@ void MailingRun::start() {
             [this, address](const QString& page, const QString&) {
                 m_download->deleteLater();
                 if (page.isNull()) {
-                    status(QStringLiteral("Could not download \"%1\"").arg(address));
+                    status(LocalizedStringNS("Could not download \"%1\"").arg(address));
                     return pageReady(QString());
                 }
                 const QByteArray bytes = page.toUtf8();
                 CText text("");
                 text.append(bytes.constData(), bytes.size());
-                status(QStringLiteral("Relinking web page..."));
+                status(LocalizedStringNS("Relinking web page..."));
                 // Reading the MIME database takes a tenth of a second: only runs with a page
                 // pay for it.
                 EnsureSuffixMap();

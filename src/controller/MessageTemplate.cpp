@@ -102,12 +102,12 @@ void MessageTemplate::clearBody() {
 
 QString MessageTemplate::getTo() {
     return requiredField(view.to(), "NoRecipientsEmail",
-                         "The 'Recipient Address:' value has not been specified.");
+                         LocalizedKey("The 'Recipient Address:' value has not been specified."));
 }
 
 QString MessageTemplate::getToName() {
     return requiredField(view.name(), "NoRecipientsName",
-                         "The 'Recipients Name:' value has not been specified.");
+                         LocalizedKey("The 'Recipients Name:' value has not been specified."));
 }
 
 QString MessageTemplate::getSubject() {

@@ -70,7 +70,7 @@ Person RecipientSelection::takeFirst() {
 void RecipientSelection::filterPeopleByRecipients() {
     if (sent.addresses().isEmpty())
         return;
-    Q_EMIT statusMessage(QStringLiteral("Filtering people by sent recipients..."));
+    Q_EMIT statusMessage(LocalizedStringNS("Filtering people by sent recipients..."));
     if (!people)
         return;
     QList<Person> kept;

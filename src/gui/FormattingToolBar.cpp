@@ -24,10 +24,10 @@ struct AlignmentTool {
 };
 
 constexpr AlignmentTool kAlignments[] = {
-    {Qt::AlignLeft | Qt::AlignAbsolute, "format-justify-left", "Align Left"},
-    {Qt::AlignHCenter, "format-justify-center", "Center"},
-    {Qt::AlignRight | Qt::AlignAbsolute, "format-justify-right", "Align Right"},
-    {Qt::AlignJustify, "format-justify-fill", "Justify"},
+    {Qt::AlignLeft | Qt::AlignAbsolute, "format-justify-left", LocalizedKey("Align Left")},
+    {Qt::AlignHCenter, "format-justify-center", LocalizedKey("Center")},
+    {Qt::AlignRight | Qt::AlignAbsolute, "format-justify-right", LocalizedKey("Align Right")},
+    {Qt::AlignJustify, "format-justify-fill", LocalizedKey("Justify")},
 };
 
 QFont styled(bool bold, bool italic, bool underline) {
@@ -91,7 +91,7 @@ void FormattingToolBar::addFontTools() {
 void FormattingToolBar::addStyleTools() {
     m_bold =
         addToggle(letterIcon("format-text-bold", QStringLiteral("B"), styled(true, false, false)),
-                  "Bold", QKeySequence::Bold);
+                  LocalizedKey("Bold"), QKeySequence::Bold);
     connect(m_bold, &QAction::triggered, this, [this](bool on) {
         QTextCharFormat format;
         format.setFontWeight(on ? QFont::Bold : QFont::Normal);
@@ -99,7 +99,7 @@ void FormattingToolBar::addStyleTools() {
     });
     m_italic =
         addToggle(letterIcon("format-text-italic", QStringLiteral("I"), styled(false, true, false)),
-                  "Italic", QKeySequence::Italic);
+                  LocalizedKey("Italic"), QKeySequence::Italic);
     connect(m_italic, &QAction::triggered, this, [this](bool on) {
         QTextCharFormat format;
         format.setFontItalic(on);
@@ -107,7 +107,7 @@ void FormattingToolBar::addStyleTools() {
     });
     m_underline = addToggle(
         letterIcon("format-text-underline", QStringLiteral("U"), styled(false, false, true)),
-        "Underline", QKeySequence::Underline);
+        LocalizedKey("Underline"), QKeySequence::Underline);
     connect(m_underline, &QAction::triggered, this, [this](bool on) {
         QTextCharFormat format;
         format.setFontUnderline(on);
@@ -129,7 +129,8 @@ void FormattingToolBar::addParagraphTools() {
         m_editor->setAlignment(Qt::Alignment(action->data().toInt()));
     });
     addSeparator();
-    m_list = addToggle(bulletListIcon("format-list-unordered"), "Bulleted List", QKeySequence());
+    m_list = addToggle(bulletListIcon("format-list-unordered"), LocalizedKey("Bulleted List"),
+                       QKeySequence());
     connect(m_list, &QAction::triggered, this, &FormattingToolBar::toggleList);
 }
 

@@ -112,10 +112,11 @@ AttachmentsController& MainWindow::attachments() const {
 MainWindow::~MainWindow() = default;
 
 QWidget* MainWindow::createFields() {
-    m_to = lineEdit("to", "someone@example.org");
-    m_name = lineEdit("name", "First Last");
-    m_subject = lineEdit("subject", "What the message is about");
-    m_webPageOrFile = lineEdit("webPageOrFile", "https://... (a page to mail with every copy)");
+    m_to = lineEdit("to", LocalizedKey("someone@example.org"));
+    m_name = lineEdit("name", LocalizedKey("First Last"));
+    m_subject = lineEdit("subject", LocalizedKey("What the message is about"));
+    m_webPageOrFile =
+        lineEdit("webPageOrFile", LocalizedKey("https://... (a page to mail with every copy)"));
 
     auto* fields = new QWidget;
     auto* form = new QFormLayout(fields);

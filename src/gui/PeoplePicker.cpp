@@ -142,18 +142,21 @@ QPushButton* PeoplePicker::button(const char* text, const char* toolTip, const c
 }
 
 QWidget* PeoplePicker::createGroupColumn() {
-    m_renameGroup =
-        button("Rename...", "Rename the group", "renameGroup", &PeoplePicker::renameGroup);
-    m_deleteGroup = button("−", "Delete the group", "deleteGroup", &PeoplePicker::deleteGroup);
-    return createColumn("&Group", m_groups,
-                        {button("+", "New group", "newGroup", &PeoplePicker::newGroup),
-                         m_deleteGroup, m_renameGroup});
+    m_renameGroup = button(LocalizedKey("Rename..."), LocalizedKey("Rename the group"),
+                           "renameGroup", &PeoplePicker::renameGroup);
+    m_deleteGroup =
+        button("−", LocalizedKey("Delete the group"), "deleteGroup", &PeoplePicker::deleteGroup);
+    return createColumn(
+        LocalizedKey("&Group"), m_groups,
+        {button("+", LocalizedKey("New group"), "newGroup", &PeoplePicker::newGroup), m_deleteGroup,
+         m_renameGroup});
 }
 
 QWidget* PeoplePicker::createPersonColumn() {
-    m_editPerson = button("Edit...", "Edit the person's names, addresses and groups", "editPerson",
-                          &PeoplePicker::editPerson);
-    m_deletePerson = button("−", "Delete the selected persons from the address book",
+    m_editPerson = button(LocalizedKey("Edit..."),
+                          LocalizedKey("Edit the person's names, addresses and groups"),
+                          "editPerson", &PeoplePicker::editPerson);
+    m_deletePerson = button("−", LocalizedKey("Delete the selected persons from the address book"),
                             "deletePerson", &PeoplePicker::deletePersons);
     m_groupsOfPerson = new QPushButton(LocalizedStringNS("Groups"));
     m_groupsOfPerson->setToolTip(LocalizedStringNS("Add the selected persons to a group, or "
@@ -163,13 +166,14 @@ QWidget* PeoplePicker::createPersonColumn() {
     m_membership = new QMenu(m_groupsOfPerson);
     m_groupsOfPerson->setMenu(m_membership);
     connect(m_membership, &QMenu::aboutToShow, this, &PeoplePicker::fillMembershipMenu);
-    return createColumn("&Name", m_persons,
-                        {button("+", "New person", "newPerson", &PeoplePicker::newPerson),
-                         m_deletePerson, m_editPerson, m_groupsOfPerson});
+    return createColumn(
+        LocalizedKey("&Name"), m_persons,
+        {button("+", LocalizedKey("New person"), "newPerson", &PeoplePicker::newPerson),
+         m_deletePerson, m_editPerson, m_groupsOfPerson});
 }
 
 QWidget* PeoplePicker::createAddressColumn() {
-    return createColumn("&Email", m_addresses, {});
+    return createColumn(LocalizedKey("&Email"), m_addresses, {});
 }
 
 QList<qint64> PeoplePicker::selectedGroups() const {

@@ -95,25 +95,25 @@ QComboBox* PreferencesDialog::addChoice(QFormLayout* form, const char* label, Ke
 
 QGroupBox* PreferencesDialog::createSender() {
     QFormLayout* form = nullptr;
-    QGroupBox* box = groupBox("Sender", form);
-    addText(form, "Name:", Key::SenderName);
-    addText(form, "Email Address:", Key::SenderEmail)
+    QGroupBox* box = groupBox(LocalizedKey("Sender"), form);
+    addText(form, LocalizedKey("Name:"), Key::SenderName);
+    addText(form, LocalizedKey("Email Address:"), Key::SenderEmail)
         ->setPlaceholderText(QStringLiteral("me@example.org"));
     return box;
 }
 
 QGroupBox* PreferencesDialog::createRecipient() {
     QFormLayout* form = nullptr;
-    QGroupBox* box = groupBox("Default Recipient", form);
-    addText(form, "Name:", Key::DefaultRecipientName);
-    addText(form, "Email Address:", Key::DefaultRecipientEmail);
+    QGroupBox* box = groupBox(LocalizedKey("Default Recipient"), form);
+    addText(form, LocalizedKey("Name:"), Key::DefaultRecipientName);
+    addText(form, LocalizedKey("Email Address:"), Key::DefaultRecipientEmail);
     return box;
 }
 
 QGroupBox* PreferencesDialog::createServer() {
     QFormLayout* form = nullptr;
-    QGroupBox* box = groupBox("Outgoing SMTP Server", form);
-    addText(form, "Address:", Key::ServerAddress)
+    QGroupBox* box = groupBox(LocalizedKey("Outgoing SMTP Server"), form);
+    addText(form, LocalizedKey("Address:"), Key::ServerAddress)
         ->setPlaceholderText(QStringLiteral("smtp.example.org"));
     m_port = new QSpinBox;
     nameAfter(m_port, Key::ServerPort);
@@ -123,9 +123,9 @@ QGroupBox* PreferencesDialog::createServer() {
     m_useSSL = new QCheckBox(LocalizedStringNS("Use SSL"));
     nameAfter(m_useSSL, Key::UseSSL);
     form->addRow(QString(), m_useSSL);
-    addChoice(form, "Authentication:", Key::SelectedAuthentication,
-              {"None", "PLAIN", "LOGIN", "CRAM-MD5"});
-    addText(form, "Username:", Key::LoginUsername);
+    addChoice(form, LocalizedKey("Authentication:"), Key::SelectedAuthentication,
+              {LocalizedKey("None"), "PLAIN", "LOGIN", "CRAM-MD5"});
+    addText(form, LocalizedKey("Username:"), Key::LoginUsername);
     m_password = new QLineEdit;
     nameAfter(m_password, Key::LoginPassword);
     m_password->setEchoMode(QLineEdit::Password);
@@ -142,25 +142,28 @@ QGroupBox* PreferencesDialog::createServer() {
 
 QGroupBox* PreferencesDialog::createMessage() {
     QFormLayout* form = nullptr;
-    QGroupBox* box = groupBox("Message", form);
-    addChoice(form, "Format:", Key::SelectedContentType,
-              {"Rich text (HTML)", "Plain text", "No typed text"});
-    addChoice(form, "Character set:", Key::SelectedCharacterSet,
-              {"Unicode (UTF-8)", "ASCII", "Western (ISO-8859-1)", "Japanese (Shift_JIS)"});
+    QGroupBox* box = groupBox(LocalizedKey("Message"), form);
+    addChoice(form, LocalizedKey("Format:"), Key::SelectedContentType,
+              {LocalizedKey("Rich text (HTML)"), LocalizedKey("Plain text"),
+               LocalizedKey("No typed text")});
+    addChoice(form, LocalizedKey("Character set:"), Key::SelectedCharacterSet,
+              {LocalizedKey("Unicode (UTF-8)"), "ASCII", LocalizedKey("Western (ISO-8859-1)"),
+               LocalizedKey("Japanese (Shift_JIS)")});
     return box;
 }
 
 QGroupBox* PreferencesDialog::createCompletion() {
     QFormLayout* form = nullptr;
-    QGroupBox* box = groupBox("When Mailing Completes", form);
-    addChoice(form, "Then:", Key::CompletionAction,
-              {"Do nothing", "Quit Pelmo", "Clear the message"});
+    QGroupBox* box = groupBox(LocalizedKey("When Mailing Completes"), form);
+    addChoice(form, LocalizedKey("Then:"), Key::CompletionAction,
+              {LocalizedKey("Do nothing"), LocalizedKey("Quit Pelmo"),
+               LocalizedKey("Clear the message")});
     return box;
 }
 
 QGroupBox* PreferencesDialog::createUpdates() {
     QFormLayout* form = nullptr;
-    QGroupBox* box = groupBox("Software Update", form);
+    QGroupBox* box = groupBox(LocalizedKey("Software Update"), form);
     m_checkForUpdates = new QCheckBox(LocalizedStringNS("Check for software updates at start-up"));
     nameAfter(m_checkForUpdates, Key::CheckForSoftwareUpdates);
     form->addRow(m_checkForUpdates);
@@ -169,7 +172,7 @@ QGroupBox* PreferencesDialog::createUpdates() {
 
 QGroupBox* PreferencesDialog::createMailLinks() {
     QFormLayout* form = nullptr;
-    QGroupBox* box = groupBox("Links to E-mail Addresses", form);
+    QGroupBox* box = groupBox(LocalizedKey("Links to E-mail Addresses"), form);
     m_defaultClient = new QLabel;
     m_defaultClient->setObjectName(QStringLiteral("defaultMailClient"));
     m_defaultClient->setWordWrap(true);

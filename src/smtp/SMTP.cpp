@@ -196,7 +196,7 @@ void SMTP::messageNotSent() {
     m_succeeded = false;
     const QString reply = DecodeUtf8Strictly(m_session->lastResponse());
     if (!reply.isEmpty()) {
-        status(QStringLiteral("Message not sent: %1").arg(reply.trimmed()));
+        status(LocalizedStringNS("Message not sent: %1").arg(reply.trimmed()));
         failed(reply.trimmed());
     } else {
         reportFailureReason();

@@ -33,7 +33,7 @@ int CLog::open_log_file(const char* path) {
     if (fd < 0)
         return errno;
     fileRef = fd;
-    return write_marker("[Logging starting at ");
+    return write_marker(LocalizedKey("[Logging starting at "));
 }
 
 int CLog::write_entry(const CString256& line) {
@@ -57,7 +57,7 @@ int CLog::write_entry(const CString256& line) {
 int CLog::close_log_file() {
     if (fileRef < 0)
         return 0;
-    write_marker("[Logging stopping at ");
+    write_marker(LocalizedKey("[Logging stopping at "));
     const int result = ::close(fileRef) == 0 ? 0 : errno;
     fileRef = -1;
     return result;
