@@ -1,5 +1,7 @@
 #pragma once
 
+#include "TestEnvironment.h"
+
 #include <QByteArray>
 #include <QTemporaryDir>
 #include <gtest/gtest.h>
@@ -12,6 +14,7 @@
 // exists, before any test.
 template <class App>
 int runTestsIn(int argc, char** argv, const std::function<void()>& started = {}) {
+    useTestEnvironment();
     QTemporaryDir home;
     if (!home.isValid())
         return 1;

@@ -1,5 +1,6 @@
 // The software update against update_server.py on 127.0.0.1, in a home folder of the test's own.
 #include "RowName.h"
+#include "TestEnvironment.h"
 #include "e2e/E2eSupport.h"
 #include "update/SoftwareUpdateController.h"
 #include "util/CLog.h"
@@ -153,6 +154,7 @@ TEST(Update, AwakeArmsTheCheckOnlyWhenOn) {
 } // namespace
 
 int main(int argc, char** argv) {
+    useTestEnvironment();
     QTemporaryDir home;
     for (const char* name : {"HOME", "XDG_CONFIG_HOME", "XDG_DATA_HOME"})
         qputenv(name, home.path().toUtf8());
