@@ -1211,6 +1211,10 @@
         <source>Download failed! Error - %@ %@</source>
         <translation>Herunterladen fehlgeschlagen! Fehler – %@ %@</translation>
     </message>
+    <message>
+        <source>To let Pelmo read %1&apos;s page, start it with --remote-debugging-port=9222.</source>
+        <translation>Damit Pelmo die Seite von %1 lesen kann, starten Sie %1 mit --remote-debugging-port=9222.</translation>
+    </message>
 </context>
 <context>
     <name>SmtpClient</name>

@@ -1211,6 +1211,10 @@
         <source>Download failed! Error - %@ %@</source>
         <translation>Échec du téléchargement ! Erreur – %@ %@</translation>
     </message>
+    <message>
+        <source>To let Pelmo read %1&apos;s page, start it with --remote-debugging-port=9222.</source>
+        <translation>Pour que Pelmo puisse lire la page de %1, lancez %1 avec --remote-debugging-port=9222.</translation>
+    </message>
 </context>
 <context>
     <name>SmtpClient</name>

@@ -1,5 +1,7 @@
 #include "browser/ChromiumDevTools.h"
 
+#include "util/LocalizedStrings.h"
+
 #include <QDir>
 #include <QFile>
 #include <QJsonArray>
@@ -74,7 +76,7 @@ std::optional<FrontPage> ChromiumDevTools::frontPage(const QByteArray& json, QSt
 }
 
 QString ChromiumDevTools::startHint(const BrowserKind& kind) {
-    return QStringLiteral("To let Pelmo read %1's page, start it with "
-                          "--remote-debugging-port=9222.")
+    return LocalizedStringNS("To let Pelmo read %1's page, start it with "
+                             "--remote-debugging-port=9222.")
         .arg(kind.name);
 }
