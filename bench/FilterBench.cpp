@@ -13,8 +13,9 @@
 #include <QTemporaryDir>
 #include <benchmark/benchmark.h>
 
+#include "RatioMain.h"
+
 #include <cstdio>
-#include <map>
 #include <memory>
 #include <string>
 
@@ -128,18 +129,10 @@ void PlainWalkFilter(benchmark::State& state) {
 }
 BENCHMARK(PlainWalkFilter)->Arg(kSmall)->Unit(benchmark::kMillisecond);
 
-// Prints the usual table, then the figures as ratios against the peers.
-class RatioReporter : public benchmark::ConsoleReporter {
-public:
-    void ReportRuns(const std::vector<Run>& runs) override {
-        ConsoleReporter::ReportRuns(runs);
-        for (const Run& run : runs)
-            if (run.iterations > 0)
-                seconds[run.run_name.function_name] = run.real_accumulated_time / run.iterations;
-    }
+} // namespace
 
-    void Finalize() override {
-        ConsoleReporter::Finalize();
+int main(int argc, char** argv) {
+    return runWithRatios<QGuiApplication>(argc, argv, [](Timings& seconds) {
         const double filter = seconds["FilterPeopleByRecipients"];
         const double set = seconds["BuildFoldedSet"];
         const double walk = seconds["PlainWalkFilter"];
@@ -154,24 +147,5 @@ public:
                     "(%.0f times the filter)\n",
                     walk * 1e3, kSmall, kLarge, walk * scale * scale,
                     walk * scale * scale / filter);
-    }
-
-private:
-    std::map<std::string, double> seconds;
-};
-
-} // namespace
-
-int main(int argc, char** argv) {
-    QTemporaryDir home;
-    qputenv("XDG_CONFIG_HOME", home.path().toUtf8());
-    qputenv("XDG_DATA_HOME", home.path().toUtf8());
-    if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM"))
-        qputenv("QT_QPA_PLATFORM", "offscreen");
-    QGuiApplication app(argc, argv);
-    benchmark::Initialize(&argc, argv);
-    RatioReporter reporter;
-    benchmark::RunSpecifiedBenchmarks(&reporter);
-    benchmark::Shutdown();
-    return 0;
+    });
 }

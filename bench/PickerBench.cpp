@@ -14,8 +14,9 @@
 #include <QTemporaryDir>
 #include <benchmark/benchmark.h>
 
+#include "RatioMain.h"
+
 #include <cstdio>
-#include <map>
 #include <memory>
 
 namespace {
@@ -73,40 +74,15 @@ void FilterOnly(benchmark::State& state) {
 }
 BENCHMARK(FilterOnly)->Unit(benchmark::kMillisecond);
 
-class RatioReporter : public benchmark::ConsoleReporter {
-public:
-    void ReportRuns(const std::vector<Run>& runs) override {
-        ConsoleReporter::ReportRuns(runs);
-        for (const Run& run : runs)
-            if (run.iterations > 0)
-                seconds[run.run_name.function_name] = run.real_accumulated_time / run.iterations;
-    }
-    void Finalize() override {
-        ConsoleReporter::Finalize();
+} // namespace
+
+int main(int argc, char** argv) {
+    return runWithRatios<QApplication>(argc, argv, [](Timings& seconds) {
         const double keystroke = seconds["SearchKeystroke"];
         const double filter = seconds["FilterOnly"];
         if (keystroke > 0 && filter > 0)
             std::printf("\nsearch in Addresses, %d persons: %.1f ms a key press, %.1f times the "
                         "filter alone (%.2f ms)\n",
                         kPersons, keystroke * 1e3, keystroke / filter, filter * 1e3);
-    }
-
-private:
-    std::map<std::string, double> seconds;
-};
-
-} // namespace
-
-int main(int argc, char** argv) {
-    QTemporaryDir home;
-    qputenv("XDG_CONFIG_HOME", home.path().toUtf8());
-    qputenv("XDG_DATA_HOME", home.path().toUtf8());
-    if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM"))
-        qputenv("QT_QPA_PLATFORM", "offscreen");
-    QApplication app(argc, argv);
-    benchmark::Initialize(&argc, argv);
-    RatioReporter reporter;
-    benchmark::RunSpecifiedBenchmarks(&reporter);
-    benchmark::Shutdown();
-    return 0;
+    });
 }
