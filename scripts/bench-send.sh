@@ -31,6 +31,9 @@ for i in range(int(sys.argv[1])):
     print(f"Reader,{i:04d},reader{i:04d}@example.org,Bench")
 PY
 "$pelmo" contacts import "$work/people.csv" > /dev/null
+python3 -c 'print("first name,last name,e-mail,groups")
+for i in range(30): print(f"Far,{i:02d},far{i:02d}@example.org,Far")' > "$work/far.csv"
+"$pelmo" contacts import "$work/far.csv" > /dev/null
 python3 -c 'print(("Dear {toName}, " + "x" * 70 + "\n") * 240, end="")' > "$work/message.txt"
 python3 -c 'print("<html><body>" + ("<p>Dear <b>{toName}</b>, " + "x" * 60 + "</p>\n") * 240 + "</body></html>")' \
   > "$work/message.html"
@@ -79,3 +82,20 @@ for kind in ("plain", "rich"):
           f"{per[kind] / per['source']:.2f}")
 print(f"  smtp-source: {per['source']:.2f} ms")
 PY
+
+# The same message to 30 members through a relay that holds each direction 10 ms, as a server
+# that far away: the server waits a copy costs, one connection a copy and with reuseConnection.
+for reuse in false true; do
+  coproc RELAY { python3 "$(dirname "$0")/delay-relay.py" "$port" --delay 10; }
+  read -r _ relay <&"${RELAY[0]}"
+  start=$(date +%s.%N)
+  "$pelmo" send --group Far --subject "Bench for {toName}" --message "$work/message.txt" \
+    --set serverAddress=127.0.0.1 --set serverPort="$relay" --set senderEmail=bench@example.org \
+    --set senderName=Bench --set selectedContentType=1 --set selectedAuthentication=0 \
+    --set useSSL=false --set reuseConnection="$reuse" > "$work/far.out"
+  end=$(date +%s.%N)
+  exec {RELAY[1]}>&-
+  read -r _ waits _ sessions <&"${RELAY[0]}"
+  python3 -c "print(f'10 ms away, reuseConnection=$reuse: {($end - $start) / 30 * 1000:.0f} ms and ' \
+                    f'{$waits / 30:.1f} server waits a copy over $sessions connections')"
+done

@@ -1215,6 +1215,18 @@
         <source>To let Pelmo read %1&apos;s page, start it with --remote-debugging-port=9222.</source>
         <translation>Damit Pelmo die Seite von %1 lesen kann, starten Sie %1 mit --remote-debugging-port=9222.</translation>
     </message>
+    <message>
+        <source>Message sent.</source>
+        <translation>Nachricht gesendet.</translation>
+    </message>
+    <message>
+        <source>Send up to 50 messages per connection</source>
+        <translation>Bis zu 50 Nachrichten je Verbindung senden</translation>
+    </message>
+    <message>
+        <source>Faster for a group; some servers limit what one connection may send</source>
+        <translation>Schneller bei einer Gruppe; manche Server begrenzen, was eine Verbindung senden darf</translation>
+    </message>
 </context>
 <context>
     <name>SmtpClient</name>
@@ -1301,6 +1313,10 @@
     <message>
         <source>The server %1 refused the message: %2</source>
         <translation>Der Server %1 hat die Nachricht abgelehnt: %2</translation>
+    </message>
+    <message>
+        <source>The server %1 refused RSET: %2</source>
+        <translation>Der Server %1 hat RSET abgelehnt: %2</translation>
     </message>
 </context>
 </TS>

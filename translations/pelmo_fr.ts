@@ -1215,6 +1215,18 @@
         <source>To let Pelmo read %1&apos;s page, start it with --remote-debugging-port=9222.</source>
         <translation>Pour que Pelmo puisse lire la page de %1, lancez %1 avec --remote-debugging-port=9222.</translation>
     </message>
+    <message>
+        <source>Message sent.</source>
+        <translation>Message envoyé.</translation>
+    </message>
+    <message>
+        <source>Send up to 50 messages per connection</source>
+        <translation>Envoyer jusqu’à 50 messages par connexion</translation>
+    </message>
+    <message>
+        <source>Faster for a group; some servers limit what one connection may send</source>
+        <translation>Plus rapide pour un groupe ; certains serveurs limitent ce qu’une connexion peut envoyer</translation>
+    </message>
 </context>
 <context>
     <name>SmtpClient</name>
@@ -1301,6 +1313,10 @@
     <message>
         <source>The server %1 refused the message: %2</source>
         <translation>Le serveur %1 a refusé le message : %2</translation>
+    </message>
+    <message>
+        <source>The server %1 refused RSET: %2</source>
+        <translation>Le serveur %1 a refusé RSET : %2</translation>
     </message>
 </context>
 </TS>

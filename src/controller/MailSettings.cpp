@@ -65,6 +65,8 @@ const Row kTable[] = {
     {Key::ImplicitTLS, "implicitTLS", false, nullptr, nullptr},
     // Read by the software update check too, which sits below this table.
     {Key::CheckForSoftwareUpdates, "checkForSoftwareUpdates", true, nullptr, nullptr},
+    // Up to 50 copies over one connection instead of one connection a copy.
+    {Key::ReuseConnection, "reuseConnection", false, nullptr, nullptr},
 };
 
 const Row& rowOf(Key key) {
@@ -84,7 +86,7 @@ std::filesystem::path pathOf(const QString& name) {
 
 MailSettings::MailSettings()
     : store(QString::fromLatin1(kOrganisationName), QString::fromLatin1(kApplicationName)) {
-    static_assert(std::size(kTable) == static_cast<size_t>(Key::CheckForSoftwareUpdates) + 1);
+    static_assert(std::size(kTable) == static_cast<size_t>(Key::ReuseConnection) + 1);
     // The file may hold the password when no keyring answers: made private before anything is
     // written to it, and tightened when an older Pelmo left it readable.
     const QFileInfo file(store.fileName());

@@ -38,6 +38,7 @@ public:
         SmtpTimeout,
         ImplicitTLS,
         CheckForSoftwareUpdates,
+        ReuseConnection,
     };
 
     /** The store of the current user; makes its folder and file private. */

@@ -139,7 +139,11 @@ void MailingRun::deliver() {
     } catch (const PelmoException& failure) {
         return halt(failure);
     }
-    auto* delivery = new SMTP(request, m_parts.createSession(request.server, request.port), this);
+    SmtpSession* open = openSessionFor(request);
+    m_onOpenSession = open != nullptr;
+    auto* delivery =
+        new SMTP(request, open ? open : m_parts.createSession(request.server, request.port), this);
+    delivery->setKeepSession(m_parts.settings.boolean(Key::ReuseConnection));
     m_delivery = delivery;
     enter(State::Delivering);
     connect(delivery, &SMTP::statusMessage, this, &MailingRun::statusMessage);
@@ -149,6 +153,8 @@ void MailingRun::deliver() {
         m_parts.notMailed.removeAddress(recipient);
     });
     connect(delivery, &SMTP::refused, this, [this, delivery] {
+        if (retryOnNewSession(delivery))
+            return;
         memberNotMailed(delivery->failureReason());
         m_everyCopyAccepted = false;
         m_parts.view.beep();
@@ -161,7 +167,53 @@ void MailingRun::deliver() {
         settleUnlessDelivering();
     });
     connect(delivery, &SMTP::finished, this, [this, delivery] { deliveryFinished(delivery); });
-    delivery->start();
+    if (open) {
+        ++m_sessionCopies;
+        delivery->startOnOpenSession();
+    } else {
+        m_openServer = request.server;
+        m_openPort = request.port;
+        m_sessionCopies = 1;
+        delivery->start();
+    }
+}
+
+SmtpSession* MailingRun::openSessionFor(const DeliveryRequest& request) {
+    constexpr int kCopiesPerSession = 50;
+    if (!m_openSession || m_sessionCopies >= kCopiesPerSession || request.server != m_openServer ||
+        request.port != m_openPort || !m_parts.settings.boolean(Key::ReuseConnection)) {
+        closeOpenSession();
+        return nullptr;
+    }
+    SmtpSession* session = m_openSession;
+    m_openSession = nullptr;
+    return session;
+}
+
+// RFC 5321 4.2.2: 421 closes the transmission channel, whatever was asked; on a connection
+// that has carried copies already it is most often the server's idle or per-connection limit.
+bool MailingRun::retryOnNewSession(SMTP* delivery) {
+    const bool closing = delivery->state() == SMTP::State::Aborted
+                             ? delivery->failureReason().startsWith(QLatin1String("421"))
+                             : delivery->state() != SMTP::State::Halted;
+    if (!m_onOpenSession || !m_member || delivery->succeeded() || delivery->messageWritten() ||
+        !closing)
+        return false;
+    m_onOpenSession = false;
+    m_parts.selection.putBack({*m_member});
+    m_member.reset();
+    return true;
+}
+
+void MailingRun::closeOpenSession() {
+    if (!m_openSession)
+        return;
+    SmtpSession* session = m_openSession;
+    m_openSession = nullptr;
+    for (auto signal : {&SmtpSession::connectionTerminated, &SmtpSession::connectionLost,
+                        &SmtpSession::connectionTimedOut})
+        connect(session, signal, session, &QObject::deleteLater);
+    session->close();
 }
 
 // The settings and texts are read in the order a message is built, so that the first missing
@@ -238,9 +290,18 @@ void MailingRun::deliveryFinished(SMTP* delivery) {
     delivery->deleteLater();
     if (m_delivery == delivery)
         m_delivery = nullptr;
+    if (delivery->state() == SMTP::State::Kept) {
+        m_openSession = delivery->takeSession();
+        m_openSession->setParent(this);
+    } else if (retryOnNewSession(delivery)) {
+        if (!sendMember())
+            finishRun(false);
+        return settleUnlessDelivering();
+    }
     if (!delivery->succeeded())
         memberNotMailed(delivery->failureReason());
     switch (delivery->state()) {
+    case SMTP::State::Kept:
     case SMTP::State::Ended:
         if (!delivery->succeeded())
             m_everyCopyAccepted = false;
@@ -280,6 +341,7 @@ void MailingRun::memberNotMailed(const QString& why) {
 }
 
 void MailingRun::showHalted() {
+    closeOpenSession();
     PelmoView& view = m_parts.view;
     // Start, then stop at once: the indicator ends spinning and still, whatever it showed.
     if (m_parts.selection.getPeople()) {
@@ -292,6 +354,7 @@ void MailingRun::showHalted() {
 }
 
 void MailingRun::endRun() {
+    closeOpenSession();
     PelmoView& view = m_parts.view;
     view.setProgressBusy();
     view.startProgressAnimation();
@@ -315,6 +378,7 @@ void MailingRun::finishRun(bool succeeded) {
 }
 
 void MailingRun::abort() {
+    closeOpenSession();
     m_parts.view.stopProgressAnimation();
     m_stopSending = true;
     m_parts.view.setSendButtonTitle(LocalizedStringNS("Send"));

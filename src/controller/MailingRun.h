@@ -30,6 +30,9 @@ class SmtpSession;
  * The parts are not owned and must outlive the run. A run stopped by the user lets the copy on
  * its way finish and leaves the persons not yet mailed pending for the next Send. A member
  * taken off the list whose copy is not accepted goes to the not-mailed list with the reason.
+ * With the setting reuseConnection, up to 50 copies go over one connection; a copy whose
+ * reused connection is lost before it went out whole, or refused with 421, goes again over a
+ * new one, so that nobody is lost or mailed twice.
  */
 class MailingRun : public QObject {
     Q_OBJECT
@@ -102,6 +105,11 @@ private:
     void settleUnlessDelivering();
     /** The member on the way was not mailed, for why; once per member. */
     void memberNotMailed(const QString& why);
+    /** The session an earlier copy left open, when the next copy may go over it; else null. */
+    SmtpSession* openSessionFor(const DeliveryRequest& request);
+    /** A copy lost with its reused session before it went out whole goes again, first. */
+    bool retryOnNewSession(SMTP* delivery);
+    void closeOpenSession();
 
     Parts m_parts;
     State m_state = State::Idle;
@@ -112,4 +120,11 @@ private:
     std::optional<Person> m_member;
     QPointer<PageDownload> m_download;
     QPointer<SMTP> m_delivery;
+    /** With reuseConnection: the session kept open between copies, its server, and how many
+     * copies it has carried. */
+    QPointer<SmtpSession> m_openSession;
+    QString m_openServer;
+    int m_openPort = 0;
+    int m_sessionCopies = 0;
+    bool m_onOpenSession = false;
 };

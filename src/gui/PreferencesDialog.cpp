@@ -123,6 +123,11 @@ QGroupBox* PreferencesDialog::createServer() {
     m_useSSL = new QCheckBox(LocalizedStringNS("Use SSL"));
     nameAfter(m_useSSL, Key::UseSSL);
     form->addRow(QString(), m_useSSL);
+    m_reuseConnection = new QCheckBox(LocalizedStringNS("Send up to 50 messages per connection"));
+    nameAfter(m_reuseConnection, Key::ReuseConnection);
+    m_reuseConnection->setToolTip(
+        LocalizedStringNS("Faster for a group; some servers limit what one connection may send"));
+    form->addRow(QString(), m_reuseConnection);
     addChoice(form, LocalizedKey("Authentication:"), Key::SelectedAuthentication,
               {LocalizedKey("None"), "PLAIN", "LOGIN", "CRAM-MD5"});
     addText(form, LocalizedKey("Username:"), Key::LoginUsername);
@@ -212,6 +217,7 @@ void PreferencesDialog::load() {
                          ? m_settings.integer(Key::ServerPort)
                          : MailSettings::suggested(Key::ServerPort).toInt());
     m_useSSL->setChecked(m_settings.boolean(Key::UseSSL));
+    m_reuseConnection->setChecked(m_settings.boolean(Key::ReuseConnection));
     // Absent, the check is on.
     m_checkForUpdates->setChecked(!m_settings.contains(Key::CheckForSoftwareUpdates) ||
                                   m_settings.boolean(Key::CheckForSoftwareUpdates));
@@ -243,6 +249,7 @@ void PreferencesDialog::save() {
     }
     m_settings.setValue(Key::ServerPort, m_port->value());
     m_settings.setValue(Key::UseSSL, m_useSSL->isChecked());
+    m_settings.setValue(Key::ReuseConnection, m_reuseConnection->isChecked());
     m_settings.setValue(Key::CheckForSoftwareUpdates, m_checkForUpdates->isChecked());
     if (m_password->text() != m_loadedPassword)
         savePassword();

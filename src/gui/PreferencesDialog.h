@@ -63,6 +63,7 @@ private:
     QList<QComboBox*> m_choices;
     QSpinBox* m_port = nullptr;
     QCheckBox* m_useSSL = nullptr;
+    QCheckBox* m_reuseConnection = nullptr;
     QCheckBox* m_checkForUpdates = nullptr;
     QLineEdit* m_password = nullptr;
     QLabel* m_passwordNote = nullptr;

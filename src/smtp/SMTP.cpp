@@ -59,27 +59,53 @@ void SMTP::halt(const PelmoException& failure) {
 
 void SMTP::end(State state) {
     m_state = state;
+    m_messageWritten = m_session && m_session->messageWritten();
     if (m_session)
         m_session->deleteLater();
     m_session = nullptr;
     Q_EMIT finished();
 }
 
+SmtpSession* SMTP::takeSession() {
+    if (m_state != State::Kept || !m_session)
+        return nullptr;
+    SmtpSession* session = m_session;
+    disconnect(session, nullptr, this, nullptr);
+    session->setParent(nullptr);
+    m_session = nullptr;
+    return session;
+}
+
+void SMTP::startOnOpenSession() {
+    trapped([this] {
+        setMessage();
+        status(LocalizedStringNS("Sending the message."));
+        m_state = State::Sending;
+        m_session->sendMessage();
+    });
+}
+
+// Builds the message, hands it to the session and listens to the session; throws as the
+// assembly does.
+void SMTP::setMessage() {
+    m_succeeded = false;
+    MessageAssembly message;
+    message.setSubject(m_request.subject);
+    message.setFrom(m_request.senderName, m_request.sender);
+    message.setTo(m_request.recipientName, m_request.recipient);
+    for (const DeliveryRequest::BodyPart& part : std::as_const(m_request.bodyParts))
+        message.addBodyPart(part.text, part.mimeType, m_request.characterSet);
+    // A file that has gone or cannot be read is left out without a word.
+    for (const QString& path : std::as_const(m_request.attachments))
+        message.addAttachment(path);
+    m_session->setMessage(message.toBytes(), message.envelopeSender(),
+                          message.envelopeRecipients());
+    connectSession();
+}
+
 void SMTP::start() {
     trapped([this] {
-        m_succeeded = false;
-        MessageAssembly message;
-        message.setSubject(m_request.subject);
-        message.setFrom(m_request.senderName, m_request.sender);
-        message.setTo(m_request.recipientName, m_request.recipient);
-        for (const DeliveryRequest::BodyPart& part : std::as_const(m_request.bodyParts))
-            message.addBodyPart(part.text, part.mimeType, m_request.characterSet);
-        // A file that has gone or cannot be read is left out without a word.
-        for (const QString& path : std::as_const(m_request.attachments))
-            message.addAttachment(path);
-        m_session->setMessage(message.toBytes(), message.envelopeSender(),
-                              message.envelopeRecipients());
-        connectSession();
+        setMessage();
         status(LocalizedFormat("Connecting to the %@ server.", {m_request.server}));
         m_state = State::Connecting;
         m_session->connectInBackgroundAndNotify();
@@ -186,10 +212,15 @@ void SMTP::authenticationFailed() {
 void SMTP::messageSent() {
     // The address the copy went to, whatever the window's fields say by now.
     Q_EMIT accepted(m_request.recipient);
+    m_succeeded = true;
+    if (m_keep) {
+        status(LocalizedStringNS("Message sent."));
+        m_state = State::Kept;
+        return Q_EMIT finished();
+    }
     status(LocalizedStringNS("Message sent. Closing the connection."));
     m_state = State::Closing;
     m_session->close();
-    m_succeeded = true;
 }
 
 void SMTP::messageNotSent() {

@@ -12,7 +12,8 @@ class SmtpSession;
  * DeliveryRequest. It builds the MIME message, connects, upgrades to TLS when asked, logs in
  * when asked, sends, and closes; every step is reported as a status line.
  *
- * The object owns its session. It ends in one of three ways, each reported once by finished():
+ * The object owns its session. It ends in one of four ways, each reported once by finished():
+ * the message accepted with the session kept open for the next (Kept, see setKeepSession()),
  * the connection closed or was lost (Ended: the run may hand over to the next recipient), it
  * timed out or TLS failed (TimedOut), or a failure stopped it (Halted: the session is closed at
  * once and whatever the server does later is ignored). A refused message (refused()) and an
@@ -37,6 +38,7 @@ public:
         Halted,              ///< a failure stopped the delivery; the session is closed
         TimedOut,            ///< a time-out or a failed TLS handshake ended the session
         Ended,               ///< the connection closed or was lost
+        Kept,                ///< the message was accepted; the open session awaits the next
     };
     Q_ENUM(State)
 
@@ -46,6 +48,21 @@ public:
 
     /** Builds the message and starts connecting; returns at once. */
     void start();
+    /**
+     * Builds the message and sends it over the session given at construction, which an
+     * earlier delivery left connected, greeted and logged in (see setKeepSession()).
+     */
+    void startOnOpenSession();
+    /**
+     * Once the message is accepted, leaves the session open and ends as Kept instead of
+     * closing it; takeSession() then hands it over.
+     */
+    void setKeepSession(bool keep) { m_keep = keep; }
+    /** The session a Kept delivery left open, reparented to nothing; the caller takes it. */
+    SmtpSession* takeSession();
+    /** Whether the message went out whole before the delivery ended, so that it may have
+     * arrived even though its acceptance was never read. */
+    bool messageWritten() const { return m_messageWritten; }
 
     State state() const { return m_state; }
     /** True once the server accepted the message. */
@@ -71,6 +88,7 @@ Q_SIGNALS:
     void finished();
 
 private:
+    void setMessage();
     void connectSession();
     void connectionEstablished();
     void serviceInitialized();
@@ -97,4 +115,6 @@ private:
     State m_state = State::Created;
     bool m_succeeded = false;
     QString m_failure;
+    bool m_keep = false;
+    bool m_messageWritten = false;
 };

@@ -279,7 +279,23 @@ void SmtpClient::sendMessage() {
             command += "RCPT TO:<" + envelopePath(recipient) + ">\r\n";
         command += "DATA";
     }
-    send(command);
+    m_messageWritten = false;
+    if (!m_resetFirst) {
+        send(command);
+        return enter(State::MailFrom);
+    }
+    m_resetFirst = false;
+    m_envelope = m_pipelined ? QByteArray() : command;
+    send(m_pipelined ? "RSET\r\n" + command : QByteArray("RSET"));
+    enter(State::Reset);
+}
+
+void SmtpClient::onReset(int code) {
+    if (!isPositive(code))
+        return finish(&SmtpSession::connectionLost,
+                      tr("The server %1 refused RSET: %2").arg(m_host, replyText()));
+    if (!m_envelope.isEmpty())
+        send(std::exchange(m_envelope, {}));
     enter(State::MailFrom);
 }
 
@@ -500,6 +516,8 @@ void SmtpClient::handleReply(int code) {
     case State::AuthResult:
     case State::AuthCancelled:
         return onAuthReply(code);
+    case State::Reset:
+        return onReset(code);
     case State::MailFrom:
         return onMailFrom(code);
     case State::RcptTo:
@@ -646,6 +664,7 @@ void SmtpClient::refuseBeforeSending(const QString& why) {
 
 void SmtpClient::refuseMessage() {
     m_pipelined = false;
+    m_resetFirst = true;
     m_errorString = tr("The server %1 refused the message: %2").arg(m_host, replyText());
     enter(State::Ready);
     notify(&SmtpSession::messageNotSent);
@@ -699,6 +718,7 @@ void SmtpClient::onData(int code) {
     if (code != 354)
         return refuseMessage();
     m_socket->write(dataBlock(m_message));
+    m_messageWritten = true;
     enter(State::DataEnd);
 }
 

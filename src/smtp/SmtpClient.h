@@ -39,7 +39,9 @@ class QSslSocket;
  * A refused MAIL, RCPT (any one recipient), DATA or end of data is messageNotSent with the
  * refusal in lastResponse(); the session stays open for close(). When the server offers
  * PIPELINING (RFC 2920), MAIL, every RCPT and DATA go in one write and their replies are read
- * in order; the first refusal among them is the one reported. What is refused before
+ * in order; the first refusal among them is the one reported. Several messages may go over one
+ * session, one sendMessage() after the other; after a refusal the next begins with RSET
+ * (RFC 5321 4.1.1.5). What is refused before
  * anything is sent (a CR, LF or NUL in a credential, a control character or angle bracket in
  * an address, a message above the server's SIZE, an unknown mechanism) is authenticationFailed
  * or messageNotSent with lastResponse() empty, as no reply belongs to it. errorString() gives
@@ -66,6 +68,7 @@ public:
         AuthCramChallenge, ///< AUTH CRAM-MD5 sent, waiting for the server's challenge.
         AuthResult,        ///< Credentials sent, waiting for 235 or a refusal.
         AuthCancelled,     ///< Unexpected challenge answered with "*", waiting for the refusal.
+        Reset,             ///< RSET sent before a new transaction, waiting for its reply.
         MailFrom,          ///< MAIL FROM sent, waiting for its reply.
         RcptTo,            ///< RCPT TO sent for one recipient, waiting for its reply.
         Data,              ///< DATA sent, waiting for 354.
@@ -101,6 +104,7 @@ public:
     void close() override;
     QByteArray lastResponse() const override;
     QString errorString() const override;
+    bool messageWritten() const override { return m_messageWritten; }
 
     State state() const { return m_state; }
     /** Implicit TLS on another port than 465, for servers set up so; only before connecting. */
@@ -146,6 +150,7 @@ private:
     QString envelopeProblem() const;
     void refuseBeforeSending(const QString& why);
     void refuseMessage();
+    void onReset(int code);
     void onMailFrom(int code);
     void onPipelinedReply(int code, State next);
     void sendNextRecipient();
@@ -183,4 +188,9 @@ private:
     bool m_pipelined = false;
     /** The first refusal among pipelined replies, reported once DATA's reply is in. */
     std::optional<SmtpReply> m_refusal;
+    /** A refused transaction may be half open: the next one on this session starts with RSET. */
+    bool m_resetFirst = false;
+    /** The envelope that waits for RSET's reply when it cannot go in the same write. */
+    QByteArray m_envelope;
+    bool m_messageWritten = false;
 };

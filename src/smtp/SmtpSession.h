@@ -49,6 +49,11 @@ public:
     virtual QByteArray lastResponse() const = 0;
     /** Why the last failure happened, for the status line ("certificate untrusted", ...). */
     virtual QString errorString() const = 0;
+    /**
+     * Whether the last message went out whole, up to its final dot: a connection lost after
+     * that may have delivered it, one lost before cannot have.
+     */
+    virtual bool messageWritten() const { return false; }
 
 Q_SIGNALS:
     void connectionEstablished();

@@ -180,6 +180,14 @@ const Scenario kScenarios[] = {
      {with<QByteArray>(&Script::refusal, "550 5.1.1 <ann@example.org>: no\r\n"),
       group(kClub + QStringList{"cy@example.org"}), choose, send,
       with<QByteArray>(&Script::refusal, {}), putBack, send}},
+    // With reuseConnection the copies share one connection, closed when the run ends.
+    {"reuse_connection",
+     {setting("reuseConnection", true), group(kClub + QStringList{"cy@example.org"}), choose,
+      send}},
+    // The connection is lost before Bob's copy went out: it goes again, over a new one.
+    {"reuse_connection_lost",
+     {setting("reuseConnection", true), with(&Script::loseAtSend, 2),
+      group(kClub + QStringList{"cy@example.org"}), choose, send}},
     // A time-out stalls the run; a lost connection hands over to the next person.
     {"timeout_then_lost",
      {with(&Script::timeOutOnConnect, true), group(kClub), choose, send, press,

@@ -6,6 +6,7 @@
 #include <QTimer>
 
 #include <functional>
+#include <memory>
 
 // A session that plays the server's part from a script, for the turns a real server is hard to
 // bring to: a refused reply that is not UTF-8, a time-out, a connection lost while sending, a
@@ -18,6 +19,8 @@ public:
         bool loseConnectionOnSend = false, dropWhenIdle = false;
         QByteArray refusal;           // non-empty: the message is refused with this reply
         std::function<void()> onSend; // runs when the message goes
+        int loseAtSend = 0;           // the connection is lost at this send of the run (1-based)
+        std::shared_ptr<int> sends = std::make_shared<int>(0); // shared by the run's sessions
     };
 
     ScriptedSession(const Script& script, QStringList& transcript)
@@ -59,7 +62,7 @@ public:
         note(QStringLiteral("send"));
         if (m_script.onSend)
             m_script.onSend();
-        if (m_script.loseConnectionOnSend)
+        if (m_script.loseConnectionOnSend || ++*m_script.sends == m_script.loseAtSend)
             return later(&SmtpSession::connectionLost);
         m_last = m_script.refusal.isEmpty() ? QByteArray("250 OK") : m_script.refusal;
         later(m_script.refusal.isEmpty() ? &SmtpSession::messageSent

@@ -80,7 +80,9 @@ inline Outcome drive(quint16 port, const Plan& plan) {
     on(&SmtpSession::authenticationCompleted, "authenticated", next);
     on(&SmtpSession::messageSent, "sent", next);
     on(&SmtpSession::authenticationFailed, "authFailed", close);
-    on(&SmtpSession::messageNotSent, "notSent", close);
+    // A refused message leaves the session for the next one, if the plan has one.
+    on(&SmtpSession::messageNotSent, "notSent",
+       [&] { sent < plan.messages.size() ? next() : close(); });
     on(&SmtpSession::connectionLost, "lost", ended);
     on(&SmtpSession::connectionTimedOut, "timedOut", ended);
     on(&SmtpSession::connectionTerminated, "terminated", ended);
