@@ -366,6 +366,8 @@ void MailingRun::endRun() {
 }
 
 void MailingRun::finishRun(bool succeeded) {
+    // A run stopped while a copy was on its way over a kept connection closes it here.
+    closeOpenSession();
     if (!m_parts.selection.getPeople())
         m_parts.view.stopProgressAnimation();
     // A stopped run has persons left for the next Send: neither quitting nor clearing the

@@ -184,6 +184,10 @@ const Scenario kScenarios[] = {
     {"reuse_connection",
      {setting("reuseConnection", true), group(kClub + QStringList{"cy@example.org"}), choose,
       send}},
+    // Stop while Ann's copy goes: the kept connection is closed once it is accepted.
+    {"reuse_connection_stopped",
+     {setting("reuseConnection", true), group(kClub), choose,
+      [](Run& run) { run.script.onSend = [&run] { run.press(); }; }, send}},
     // The connection is lost before Bob's copy went out: it goes again, over a new one.
     {"reuse_connection_lost",
      {setting("reuseConnection", true), with(&Script::loseAtSend, 2),
