@@ -1227,6 +1227,18 @@
         <source>Faster for a group; some servers limit what one connection may send</source>
         <translation>Schneller bei einer Gruppe; manche Server begrenzen, was eine Verbindung senden darf</translation>
     </message>
+    <message>
+        <source>Add a plain-text version to rich-text messages</source>
+        <translation>Formatierten Nachrichten eine Nur-Text-Fassung beifügen</translation>
+    </message>
+    <message>
+        <source>Unsubscribe address:</source>
+        <translation>Abmeldeadresse:</translation>
+    </message>
+    <message>
+        <source>mailto: or https: address (optional)</source>
+        <translation>mailto:- oder https:-Adresse (freiwillig)</translation>
+    </message>
 </context>
 <context>
     <name>SmtpClient</name>

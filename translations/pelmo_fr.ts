@@ -1227,6 +1227,18 @@
         <source>Faster for a group; some servers limit what one connection may send</source>
         <translation>Plus rapide pour un groupe ; certains serveurs limitent ce qu’une connexion peut envoyer</translation>
     </message>
+    <message>
+        <source>Add a plain-text version to rich-text messages</source>
+        <translation>Joindre une version texte brut aux messages en texte enrichi</translation>
+    </message>
+    <message>
+        <source>Unsubscribe address:</source>
+        <translation>Adresse de désinscription :</translation>
+    </message>
+    <message>
+        <source>mailto: or https: address (optional)</source>
+        <translation>adresse mailto: ou https: (facultative)</translation>
+    </message>
 </context>
 <context>
     <name>SmtpClient</name>

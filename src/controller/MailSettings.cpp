@@ -67,6 +67,10 @@ const Row kTable[] = {
     {Key::CheckForSoftwareUpdates, "checkForSoftwareUpdates", true, nullptr, nullptr},
     // Up to 50 copies over one connection instead of one connection a copy.
     {Key::ReuseConnection, "reuseConnection", false, nullptr, nullptr},
+    // Rich text goes with a plain-text version of itself.
+    {Key::AddPlainTextAlternative, "addPlainTextAlternative", false, nullptr, nullptr},
+    // A mailto: or https: address where a recipient unsubscribes.
+    {Key::ListUnsubscribe, "listUnsubscribe", QVariant(), nullptr, nullptr},
 };
 
 const Row& rowOf(Key key) {
@@ -86,7 +90,7 @@ std::filesystem::path pathOf(const QString& name) {
 
 MailSettings::MailSettings()
     : store(QString::fromLatin1(kOrganisationName), QString::fromLatin1(kApplicationName)) {
-    static_assert(std::size(kTable) == static_cast<size_t>(Key::ReuseConnection) + 1);
+    static_assert(std::size(kTable) == static_cast<size_t>(Key::ListUnsubscribe) + 1);
     // The file may hold the password when no keyring answers: made private before anything is
     // written to it, and tightened when an older Pelmo left it readable.
     const QFileInfo file(store.fileName());

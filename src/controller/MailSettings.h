@@ -39,6 +39,8 @@ public:
         ImplicitTLS,
         CheckForSoftwareUpdates,
         ReuseConnection,
+        AddPlainTextAlternative,
+        ListUnsubscribe,
     };
 
     /** The store of the current user; makes its folder and file private. */

@@ -233,6 +233,8 @@ DeliveryRequest MailingRun::buildRequest() {
     switch (settings.integer(Key::SelectedContentType)) {
     case 0:
         request.bodyParts.append({message.getHTMLMessage(), QStringLiteral("text/html")});
+        if (settings.boolean(Key::AddPlainTextAlternative))
+            request.plainAlternative = message.getMessage();
         break;
     case 1:
         request.bodyParts.append({message.getMessage(), QStringLiteral("text/plain")});
@@ -243,6 +245,7 @@ DeliveryRequest MailingRun::buildRequest() {
     if (const QString page = message.getWebPageOrFileContents(); !page.isNull())
         request.bodyParts.append({page, QStringLiteral("text/html")});
     request.attachments = m_parts.attachments.getAttachments();
+    request.listUnsubscribe = settings.string(Key::ListUnsubscribe);
     request.server = settings.required(Key::ServerAddress);
     request.port = settings.port();
     request.useSSL = settings.boolean(Key::UseSSL);

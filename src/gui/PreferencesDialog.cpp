@@ -154,6 +154,12 @@ QGroupBox* PreferencesDialog::createMessage() {
     addChoice(form, LocalizedKey("Character set:"), Key::SelectedCharacterSet,
               {LocalizedKey("Unicode (UTF-8)"), "ASCII", LocalizedKey("Western (ISO-8859-1)"),
                LocalizedKey("Japanese (Shift_JIS)")});
+    m_plainAlternative =
+        new QCheckBox(LocalizedStringNS("Add a plain-text version to rich-text messages"));
+    nameAfter(m_plainAlternative, Key::AddPlainTextAlternative);
+    form->addRow(QString(), m_plainAlternative);
+    addText(form, LocalizedKey("Unsubscribe address:"), Key::ListUnsubscribe)
+        ->setPlaceholderText(LocalizedStringNS("mailto: or https: address (optional)"));
     return box;
 }
 
@@ -218,6 +224,7 @@ void PreferencesDialog::load() {
                          : MailSettings::suggested(Key::ServerPort).toInt());
     m_useSSL->setChecked(m_settings.boolean(Key::UseSSL));
     m_reuseConnection->setChecked(m_settings.boolean(Key::ReuseConnection));
+    m_plainAlternative->setChecked(m_settings.boolean(Key::AddPlainTextAlternative));
     // Absent, the check is on.
     m_checkForUpdates->setChecked(!m_settings.contains(Key::CheckForSoftwareUpdates) ||
                                   m_settings.boolean(Key::CheckForSoftwareUpdates));
@@ -250,6 +257,7 @@ void PreferencesDialog::save() {
     m_settings.setValue(Key::ServerPort, m_port->value());
     m_settings.setValue(Key::UseSSL, m_useSSL->isChecked());
     m_settings.setValue(Key::ReuseConnection, m_reuseConnection->isChecked());
+    m_settings.setValue(Key::AddPlainTextAlternative, m_plainAlternative->isChecked());
     m_settings.setValue(Key::CheckForSoftwareUpdates, m_checkForUpdates->isChecked());
     if (m_password->text() != m_loadedPassword)
         savePassword();

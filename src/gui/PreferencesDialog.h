@@ -64,6 +64,7 @@ private:
     QSpinBox* m_port = nullptr;
     QCheckBox* m_useSSL = nullptr;
     QCheckBox* m_reuseConnection = nullptr;
+    QCheckBox* m_plainAlternative = nullptr;
     QCheckBox* m_checkForUpdates = nullptr;
     QLineEdit* m_password = nullptr;
     QLabel* m_passwordNote = nullptr;

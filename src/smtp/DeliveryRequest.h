@@ -48,6 +48,10 @@ struct DeliveryRequest {
     /** The character-set setting's index of the text parts. */
     int characterSet = 0;
     QList<BodyPart> bodyParts;
+    /** Not null: the first body part (HTML) goes with this plain text as its alternative. */
+    QString plainAlternative;
+    /** A mailto: or https: address for List-Unsubscribe; anything else adds no header. */
+    QString listUnsubscribe;
     /** Full paths; a file that cannot be read when the message is built is left out. */
     QStringList attachments;
 };

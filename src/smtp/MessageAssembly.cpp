@@ -158,6 +158,18 @@ void setContent(GMimePart* part, const QByteArray& bytes, GMimeContentEncoding e
     g_mime_part_set_content(part, content.get());
 }
 
+// A base64 text part, as addBodyPart() describes it.
+GPointer<GMimePart> bodyPart(const QString& text, const QString& mimeType, int characterSetIndex) {
+    GPointer<GMimePart> part(g_mime_part_new());
+    setContentType(part.get(), headerText(mimeType, LocalizedString("content type")));
+    if (const char* charset = charsetParameter(characterSetIndex))
+        g_mime_object_set_content_type_parameter(GMIME_OBJECT(part.get()), "charset", charset);
+    setContent(part.get(), bodyBytes(text, mimeType, characterSetIndex),
+               GMIME_CONTENT_ENCODING_DEFAULT);
+    g_mime_part_set_content_encoding(part.get(), GMIME_CONTENT_ENCODING_BASE64);
+    return part;
+}
+
 } // namespace
 
 struct MessageAssembly::Message {
@@ -228,14 +240,35 @@ void MessageAssembly::setTo(const QString& name, const QString& address) {
 
 void MessageAssembly::addBodyPart(const QString& text, const QString& mimeType,
                                   int characterSetIndex) {
-    const GPointer<GMimePart> part(g_mime_part_new());
-    setContentType(part.get(), headerText(mimeType, LocalizedString("content type")));
-    if (const char* charset = charsetParameter(characterSetIndex))
-        g_mime_object_set_content_type_parameter(GMIME_OBJECT(part.get()), "charset", charset);
-    setContent(part.get(), bodyBytes(text, mimeType, characterSetIndex),
-               GMIME_CONTENT_ENCODING_DEFAULT);
-    g_mime_part_set_content_encoding(part.get(), GMIME_CONTENT_ENCODING_BASE64);
-    g_mime_multipart_add(message->parts.get(), GMIME_OBJECT(part.get()));
+    g_mime_multipart_add(message->parts.get(),
+                         GMIME_OBJECT(bodyPart(text, mimeType, characterSetIndex).get()));
+}
+
+void MessageAssembly::addAlternativeBodyParts(const QString& plain, const QString& html,
+                                              int characterSetIndex) {
+    const GPointer<GMimeMultipart> alternative(g_mime_multipart_new_with_subtype("alternative"));
+    g_mime_multipart_set_boundary(alternative.get(), nullptr);
+    g_mime_multipart_add(
+        alternative.get(),
+        GMIME_OBJECT(bodyPart(plain, QStringLiteral("text/plain"), characterSetIndex).get()));
+    g_mime_multipart_add(
+        alternative.get(),
+        GMIME_OBJECT(bodyPart(html, QStringLiteral("text/html"), characterSetIndex).get()));
+    g_mime_multipart_add(message->parts.get(), GMIME_OBJECT(alternative.get()));
+}
+
+bool MessageAssembly::setListUnsubscribe(const QString& address) {
+    const QUrl url(address.trimmed(), QUrl::StrictMode);
+    const QString scheme = url.scheme().toLower();
+    if (!url.isValid() || (scheme != QLatin1String("mailto") && scheme != QLatin1String("https")))
+        return false;
+    const QByteArray value = '<' + url.toEncoded() + '>';
+    GMimeObject* top = GMIME_OBJECT(message->mime.get());
+    g_mime_object_set_header(top, "List-Unsubscribe", value.constData(), nullptr);
+    if (scheme == QLatin1String("https"))
+        g_mime_object_set_header(top, "List-Unsubscribe-Post", "List-Unsubscribe=One-Click",
+                                 nullptr);
+    return true;
 }
 
 bool MessageAssembly::addAttachment(const QString& path) {

@@ -41,6 +41,19 @@ public:
      * in text/html and "?" in any other type. Line ends become CRLF (RFC 2046 4.1.1).
      */
     void addBodyPart(const QString& text, const QString& mimeType, int characterSetIndex);
+    /**
+     * Appends a multipart/alternative (RFC 2046 5.1.4) of plain, then html, each as
+     * addBodyPart() makes it: a reader shows the last it can, and spam filters trust a
+     * message that has both.
+     */
+    void addAlternativeBodyParts(const QString& plain, const QString& html,
+                                 int characterSetIndex);
+    /**
+     * Adds List-Unsubscribe (RFC 2369 3.2) with address when it is a mailto: or https: URL,
+     * and with an https: one List-Unsubscribe-Post for one-click unsubscribing (RFC 8058 3.1);
+     * any other address adds nothing and answers false.
+     */
+    bool setListUnsubscribe(const QString& address);
 
     /**
      * Appends the file at path as a quoted-printable attachment named after the path's last

@@ -93,8 +93,15 @@ void SMTP::setMessage() {
     message.setSubject(m_request.subject);
     message.setFrom(m_request.senderName, m_request.sender);
     message.setTo(m_request.recipientName, m_request.recipient);
-    for (const DeliveryRequest::BodyPart& part : std::as_const(m_request.bodyParts))
-        message.addBodyPart(part.text, part.mimeType, m_request.characterSet);
+    for (qsizetype i = 0; i < m_request.bodyParts.size(); ++i) {
+        const DeliveryRequest::BodyPart& part = m_request.bodyParts.at(i);
+        if (i == 0 && !m_request.plainAlternative.isNull())
+            message.addAlternativeBodyParts(m_request.plainAlternative, part.text,
+                                            m_request.characterSet);
+        else
+            message.addBodyPart(part.text, part.mimeType, m_request.characterSet);
+    }
+    message.setListUnsubscribe(m_request.listUnsubscribe);
     // A file that has gone or cannot be read is left out without a word.
     for (const QString& path : std::as_const(m_request.attachments))
         message.addAttachment(path);

@@ -8,6 +8,8 @@
 
 #include <gmime/gmime.h>
 
+#include <functional>
+
 ServerProcess::ServerProcess(const QString& script, const QStringList& arguments) {
     m_process.setProgram(QStringLiteral(PELMO_PYTHON3));
     m_process.setArguments(QStringList{QStringLiteral("-u"), script} + arguments);
@@ -182,11 +184,20 @@ ReceivedMessage parseMessage(const QByteArray& bytes) {
             QString::fromUtf8(g_mime_object_get_header(GMIME_OBJECT(parsed), "MIME-Version"));
         GMimeObject* top = g_mime_message_get_mime_part(parsed);
         message.topType = top == nullptr ? QString() : partOf(top).mimeType;
-        if (top != nullptr && GMIME_IS_MULTIPART(top)) {
-            GMimeMultipart* multipart = GMIME_MULTIPART(top);
-            for (int i = 0; i < g_mime_multipart_get_count(multipart); ++i)
-                message.parts << partOf(g_mime_multipart_get_part(multipart, i));
-        }
+        message.listUnsubscribe =
+            QString::fromUtf8(g_mime_object_get_header(GMIME_OBJECT(parsed), "List-Unsubscribe"));
+        // A nested multipart stands in the list, followed by its own parts.
+        const std::function<void(GMimeObject*)> addParts = [&](GMimeObject* object) {
+            GMimeMultipart* multipart = GMIME_MULTIPART(object);
+            for (int i = 0; i < g_mime_multipart_get_count(multipart); ++i) {
+                GMimeObject* child = g_mime_multipart_get_part(multipart, i);
+                message.parts << partOf(child);
+                if (GMIME_IS_MULTIPART(child))
+                    addParts(child);
+            }
+        };
+        if (top != nullptr && GMIME_IS_MULTIPART(top))
+            addParts(top);
         g_object_unref(parsed);
     }
     g_object_unref(parser);

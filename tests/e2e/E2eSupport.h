@@ -67,7 +67,7 @@ struct ReceivedPart {
 
 /** A message as the server received it, parsed with GMime. */
 struct ReceivedMessage {
-    QString subject, from, to, topType, date, messageId, mimeVersion;
+    QString subject, from, to, topType, date, messageId, mimeVersion, listUnsubscribe;
     QList<ReceivedPart> parts;
     bool bareLineFeed = false;
 };

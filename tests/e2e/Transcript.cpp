@@ -27,6 +27,8 @@ QString outline(const QByteArray& bytes) {
     EXPECT_FALSE(message.bareLineFeed || message.date.isEmpty() || message.messageId.isEmpty());
     QStringList lines = {"From: " + message.from, "To: " + message.to,
                          "Subject: " + message.subject, message.topType};
+    if (!message.listUnsubscribe.isEmpty())
+        lines.insert(3, "List-Unsubscribe: " + message.listUnsubscribe);
     for (const ReceivedPart& part : message.parts)
         lines << QStringLiteral("  %1 %2 %3%4: \"%5\"")
                      .arg(

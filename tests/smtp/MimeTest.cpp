@@ -51,6 +51,11 @@ struct Mail {
                 message.setTo(field[0], field.value(1)), recipient = field.value(1);
             else if (verb == "part")
                 message.addBodyPart(field[2], field[0], field[1].toInt());
+            else if (verb == "alternative")
+                message.addAlternativeBodyParts(field[1], field[2], field[0].toInt());
+            else if (verb == "unsubscribe")
+                EXPECT_EQ(message.setListUnsubscribe(field[0]), field.value(1) != "refused")
+                    << step.toStdString();
             else if (QFile file(dir.filePath(field[0])); verb == "file") {
                 const QByteArray bytes = raw[1] == "binary" ? binary() : raw[1];
                 EXPECT_TRUE(file.open(QIODevice::WriteOnly) && file.write(bytes) == bytes.size());
@@ -91,11 +96,16 @@ QString outline(const ReceivedMessage& message) {
 }
 
 // The message as it goes on the wire, LF for CRLF, with what changes from one run to the next
-// (the date, the Message-ID and the boundary) made placeholders.
+// (the date, the Message-ID and the boundaries) made placeholders.
 QString wire(const QByteArray& bytes) {
     QString text = QString::fromLatin1(bytes).replace(QStringLiteral("\r\n"), QStringLiteral("\n"));
     const QRegularExpression::PatternOption lines = QRegularExpression::MultilineOption;
-    text.replace(QRegularExpression("boundary=\"([^\"]+)\"").match(text).captured(1), "BOUNDARY");
+    // The outer boundary, then a nested part's.
+    for (const char* name : {"BOUNDARY", "INNER"})
+        if (const QString boundary =
+                QRegularExpression("boundary=\"(?!BOUNDARY\")([^\"]+)\"").match(text).captured(1);
+            !boundary.isEmpty())
+            text.replace(boundary, QLatin1String(name));
     text.replace(QRegularExpression("^Date: .+$", lines), QStringLiteral("Date: DATE"));
     return text.replace(QRegularExpression("^Message-Id: <[^@]+@", lines), "Message-Id: <ID@");
 }
