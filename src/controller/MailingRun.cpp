@@ -200,6 +200,7 @@ bool MailingRun::retryOnNewSession(SMTP* delivery) {
         !closing)
         return false;
     m_onOpenSession = false;
+    m_retried = delivery;
     m_parts.selection.putBack({*m_member});
     m_member.reset();
     return true;
@@ -296,7 +297,8 @@ void MailingRun::deliveryFinished(SMTP* delivery) {
     if (delivery->state() == SMTP::State::Kept) {
         m_openSession = delivery->takeSession();
         m_openSession->setParent(this);
-    } else if (retryOnNewSession(delivery)) {
+    } else if (delivery == m_retried || retryOnNewSession(delivery)) {
+        // The copy goes again: this delivery neither failed the run nor mailed anyone.
         if (!sendMember())
             finishRun(false);
         return settleUnlessDelivering();
@@ -357,6 +359,7 @@ void MailingRun::showHalted() {
 }
 
 void MailingRun::endRun() {
+    // Closed before the end is announced; finishRun() closes one a stopped run leaves.
     closeOpenSession();
     PelmoView& view = m_parts.view;
     view.setProgressBusy();

@@ -127,4 +127,6 @@ private:
     int m_openPort = 0;
     int m_sessionCopies = 0;
     bool m_onOpenSession = false;
+    /** The delivery whose copy goes again over a new connection; its end is not a failure. */
+    QPointer<SMTP> m_retried;
 };

@@ -242,6 +242,10 @@ void SMTP::messageNotSent() {
     }
     m_state = State::Aborted;
     Q_EMIT refused();
+    // RFC 5321 4.2.2: with 421 the server is closing the channel. A kept connection is left
+    // no later than the server leaves it, so that the copy can go again over a new one.
+    if (m_keep && reply.startsWith(QLatin1String("421")) && m_session)
+        m_session->close();
 }
 
 void SMTP::reportFailureReason() {

@@ -55,7 +55,7 @@ public:
     void startOnOpenSession();
     /**
      * Once the message is accepted, leaves the session open and ends as Kept instead of
-     * closing it; takeSession() then hands it over.
+     * closing it; takeSession() then hands it over. A refusal with 421 then closes it.
      */
     void setKeepSession(bool keep) { m_keep = keep; }
     /** The session a Kept delivery left open, reparented to nothing; the caller takes it. */

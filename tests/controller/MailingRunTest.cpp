@@ -188,6 +188,12 @@ const Scenario kScenarios[] = {
     {"reuse_connection_stopped",
      {setting("reuseConnection", true), group(kClub), choose,
       [](Run& run) { run.script.onSend = [&run] { run.press(); }; }, send}},
+    // The server closes the kept connection with 421 at Bob's copy: it goes again, over a new
+    // one, and the run completes as if nothing happened.
+    {"reuse_connection_421",
+     {setting("reuseConnection", true), setting("completionAction", 2),
+      with<QByteArray>(&Script::refusal, "421 4.4.2 Idle too long\r\n"),
+      with(&Script::refuseAtSend, 2), group(kClub + QStringList{"cy@example.org"}), choose, send}},
     // The connection is lost before Bob's copy went out: it goes again, over a new one.
     {"reuse_connection_lost",
      {setting("reuseConnection", true), with(&Script::loseAtSend, 2),

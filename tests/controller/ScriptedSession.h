@@ -20,6 +20,7 @@ public:
         QByteArray refusal;           // non-empty: the message is refused with this reply
         std::function<void()> onSend; // runs when the message goes
         int loseAtSend = 0;           // the connection is lost at this send of the run (1-based)
+        int refuseAtSend = 0;         // set: the refusal is for this send of the run only
         std::shared_ptr<int> sends = std::make_shared<int>(0); // shared by the run's sessions
     };
 
@@ -62,11 +63,13 @@ public:
         note(QStringLiteral("send"));
         if (m_script.onSend)
             m_script.onSend();
-        if (m_script.loseConnectionOnSend || ++*m_script.sends == m_script.loseAtSend)
+        const int send = ++*m_script.sends;
+        if (m_script.loseConnectionOnSend || send == m_script.loseAtSend)
             return later(&SmtpSession::connectionLost);
-        m_last = m_script.refusal.isEmpty() ? QByteArray("250 OK") : m_script.refusal;
-        later(m_script.refusal.isEmpty() ? &SmtpSession::messageSent
-                                         : &SmtpSession::messageNotSent);
+        const bool refused = !m_script.refusal.isEmpty() &&
+                             (m_script.refuseAtSend == 0 || send == m_script.refuseAtSend);
+        m_last = refused ? m_script.refusal : QByteArray("250 OK");
+        later(refused ? &SmtpSession::messageNotSent : &SmtpSession::messageSent);
     }
     void close() override {
         note(QStringLiteral("close")), m_closed = true, later(&SmtpSession::connectionTerminated);
