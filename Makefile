@@ -65,6 +65,7 @@ bench: deps
 	cmake --build $(BUILD_BENCH) -j $(JOBS)
 	@for b in $(BUILD_BENCH)/bench/*_bench; do echo "== $$b"; "$$b" || exit 1; done
 	@echo "== scripts/bench-startup.sh"; bash scripts/bench-startup.sh $(BUILD_BENCH)/src/pelmo
+	@echo "== scripts/bench-relink.sh"; bash scripts/bench-relink.sh $(BUILD_BENCH)/src/pelmo
 	@echo "== scripts/bench-send.sh"; bash scripts/bench-send.sh $(BUILD_BENCH)/src/pelmo
 
 # Plants each fault of scripts/mutants.list in a copy of the tree under build/mutants, one at a

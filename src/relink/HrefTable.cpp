@@ -83,10 +83,13 @@ HrefTable::HrefTable(const CString256& pageURL, ip_protocols scheme)
     : m_base(pageURL.c_str()), m_scheme(scheme) {}
 
 void HrefTable::add(std::string_view href) {
-    const CString256 key(std::string(href.substr(0, CString256::max_length)).c_str());
-    auto [slot, isNew] = m_index.try_emplace(key.c_str(), m_entries.size());
-    if (!isNew)
+    // Exactly what a CString256 of it keeps: up to its first NUL, at most 255 bytes.
+    std::string_view cut = href.substr(0, CString256::max_length);
+    cut = cut.substr(0, cut.find('\0'));
+    if (m_index.find(cut) != m_index.end())
         return;
+    m_index.emplace(std::string(cut), m_entries.size());
+    const CString256 key(std::string(cut).c_str());
     CString256 full;
     ResolveHref(m_base, m_scheme, key, full);
     m_entries.push_back({key.c_str(), full.c_str()});

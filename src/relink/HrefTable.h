@@ -33,7 +33,12 @@ private:
     CURL m_base;
     ip_protocols m_scheme;
     std::vector<MappedURLReplacer::Entry> m_entries;
-    std::unordered_map<std::string, size_t> m_index;
+    /** Looked up by a view into the page, so that a reference seen before costs no copy. */
+    struct Hash {
+        using is_transparent = void;
+        size_t operator()(std::string_view key) const { return std::hash<std::string_view>{}(key); }
+    };
+    std::unordered_map<std::string, size_t, Hash, std::equal_to<>> m_index;
 };
 
 /** Whether a reference stays in the page (an anchor) or leaves it for a mail client. */

@@ -1,13 +1,13 @@
 #include "PageGenerator.h"
 #include "ReferenceRelink.h"
 
+#include "relink/FoldTable.h"
 #include "relink/Relink.h"
 #include "relink/SuffixMap.h"
 
 #include <QFile>
 #include <QStandardPaths>
 #include <gtest/gtest.h>
-
 
 #include <fstream>
 #include <sstream>
@@ -134,9 +134,8 @@ TEST(Relink, SuffixMapFromTheCacheIsTheMapBuilt) {
         std::vector<std::string> rows;
         for (const elem<Link<CString256, ICMapEntry>*>* row = gSuffixMap.list.first; row;
              row = row->next)
-            rows.push_back(std::string(row->data->key.c_str()) + " " +
-                           row->data->value.MIMEType + " " +
-                           std::to_string(row->data->value.fileType));
+            rows.push_back(std::string(row->data->key.c_str()) + " " + row->data->value.MIMEType +
+                           " " + std::to_string(row->data->value.fileType));
         return rows;
     };
     QFile cache(QStandardPaths::writableLocation(QStandardPaths::GenericCacheLocation) +
@@ -160,3 +159,34 @@ TEST(Relink, SuffixMapFromTheCacheIsTheMapBuilt) {
 }
 
 } // namespace
+
+// The case-folding search looks ahead with memchr a window at a time for each case of the first
+// byte: a match just past a window's end, at the text's last position, or behind many false
+// starts of the other case must be found where a byte-by-byte search finds it.
+TEST(Relink, FoldedSearchFindsWhatAByteByByteSearchFinds) {
+    const FoldTable fold;
+    const auto plain = [&](std::string_view text, std::string_view pattern, size_t from) {
+        for (size_t i = from; i + pattern.size() <= text.size(); ++i)
+            if (fold.equal(text.substr(i, pattern.size()), pattern))
+                return i;
+        return std::string_view::npos;
+    };
+    const struct {
+        const char* name;
+        std::string text;
+        std::string pattern;
+    } rows[] = {
+        {"rare capital beyond several windows", std::string(900, 'x') + "HrEf=\"", "href=\""},
+        {"at a window's end", std::string(255, 'x') + "href=" + std::string(300, 'x'), "HREF="},
+        {"at the last position", std::string(600, 'h') + "HREF", "href"},
+        {"false starts of both cases", std::string(400, 'h') + std::string(3, 'H') + "hreF",
+         "HREF"},
+        {"first byte not a letter", std::string(700, '=') + "=\"x", "=\""},
+        {"pattern longer than the text", "hr", "href"},
+    };
+    for (const auto& row : rows) {
+        for (size_t from = 0; from <= row.text.size(); ++from)
+            EXPECT_EQ(fold.find(row.text, row.pattern, from), plain(row.text, row.pattern, from))
+                << row.name << " from " << from;
+    }
+}
