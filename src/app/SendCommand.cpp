@@ -23,11 +23,11 @@ namespace {
 constexpr char kUsage[] =
     "usage: pelmo send [--group NAME | --to ADDRESS [--name NAME]] [--subject TEXT]\n"
     "                  [--message FILE] [--page URL | --front-page] [--attach FILE]...\n"
-    "                  [--set KEY=VALUE]... [--dry-run DIR]\n";
+    "                  [--set KEY=VALUE]... [--dry-run DIR] [--resume]\n";
 
 struct SendOptions {
     QString group, to, name, subject, messageFile, page, dryRunDirectory;
-    bool hasTo = false, hasName = false, frontPage = false;
+    bool hasTo = false, hasName = false, frontPage = false, resume = false;
     QStringList attachments;
     QList<QPair<QString, QString>> settings;
 };
@@ -64,6 +64,8 @@ SendOptions parse(const QStringList& args) {
             options.page = valueAfter(args, i);
         } else if (option == QLatin1String("--front-page")) {
             options.frontPage = true;
+        } else if (option == QLatin1String("--resume")) {
+            options.resume = true;
         } else if (option == QLatin1String("--attach")) {
             options.attachments << valueAfter(args, i);
         } else if (option == QLatin1String("--dry-run")) {
@@ -145,6 +147,14 @@ bool prepare(PelmoController& controller, AddressBook& book, const SendOptions& 
     controller.getAttachments().addFiles(paths);
     if (!options.dryRunDirectory.isEmpty())
         writeCopiesTo(controller, options.dryRunDirectory);
+    // Before the group is chosen, which leaves out whoever is in the sent list.
+    if (const int mailed = controller.findInterruptedRun(); options.resume && mailed > 0)
+        controller.restoreInterruptedRun();
+    else if (mailed > 0)
+        QTextStream(stderr) << "pelmo send: a run that did not finish had mailed " << mailed
+                            << " recipients; --resume leaves them out\n";
+    else if (options.resume)
+        QTextStream(stderr) << "pelmo send: no run was left unfinished; mailing everyone\n";
     if (options.group.isEmpty())
         return true;
     const std::optional<Group> group = book.groupNamed(options.group);

@@ -56,6 +56,8 @@ int runWindow(const QString& link, SingleInstance& instance) {
     SoftwareUpdateController updates;
     window->setSoftwareUpdate(updates);
     window->show();
+    if (const int mailed = controller.findInterruptedRun(); mailed > 0)
+        window->offerInterruptedRun(mailed);
     updates.awake();
     QObject::connect(qApp, &QCoreApplication::aboutToQuit, &controller,
                      &PelmoController::applicationWillTerminate);

@@ -71,6 +71,8 @@ const Row kTable[] = {
     {Key::AddPlainTextAlternative, "addPlainTextAlternative", false, nullptr, nullptr},
     // A mailto: or https: address where a recipient unsubscribes.
     {Key::ListUnsubscribe, "listUnsubscribe", QVariant(), nullptr, nullptr},
+    // A member's copy refused for good is skipped instead of stopping the run.
+    {Key::ContinueAfterRefusal, "continueAfterRefusal", false, nullptr, nullptr},
 };
 
 const Row& rowOf(Key key) {
@@ -90,7 +92,7 @@ std::filesystem::path pathOf(const QString& name) {
 
 MailSettings::MailSettings()
     : store(QString::fromLatin1(kOrganisationName), QString::fromLatin1(kApplicationName)) {
-    static_assert(std::size(kTable) == static_cast<size_t>(Key::ListUnsubscribe) + 1);
+    static_assert(std::size(kTable) == static_cast<size_t>(Key::ContinueAfterRefusal) + 1);
     // The file may hold the password when no keyring answers: made private before anything is
     // written to it, and tightened when an older Pelmo left it readable.
     const QFileInfo file(store.fileName());

@@ -41,6 +41,7 @@ public:
         ReuseConnection,
         AddPlainTextAlternative,
         ListUnsubscribe,
+        ContinueAfterRefusal,
     };
 
     /** The store of the current user; makes its folder and file private. */

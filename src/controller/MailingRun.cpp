@@ -17,6 +17,7 @@
 #include "util/TextUtilities.h"
 
 #include <QDateTime>
+#include <QRegularExpression>
 
 namespace {
 
@@ -147,13 +148,14 @@ void MailingRun::deliver() {
     m_delivery = delivery;
     enter(State::Delivering);
     connect(delivery, &SMTP::statusMessage, this, &MailingRun::statusMessage);
-    connect(delivery, &SMTP::accepted, this, [this](const QString& recipient) {
+    connect(delivery, &SMTP::accepted, this, [this, delivery](const QString& recipient) {
+        Q_EMIT copyAccepted(recipient, delivery->messageId());
         m_member.reset();
         m_parts.sent.addRecipient(recipient);
         m_parts.notMailed.removeAddress(recipient);
     });
     connect(delivery, &SMTP::refused, this, [this, delivery] {
-        if (retryOnNewSession(delivery))
+        if (retryOnNewSession(delivery) || skipRefusedCopy(delivery))
             return;
         memberNotMailed(delivery->failureReason());
         m_everyCopyAccepted = false;
@@ -203,6 +205,22 @@ bool MailingRun::retryOnNewSession(SMTP* delivery) {
     m_retried = delivery;
     m_parts.selection.putBack({*m_member});
     m_member.reset();
+    return true;
+}
+
+// RFC 5321 4.2.1: a 5yz reply is a permanent refusal of this transaction only; a 4yz one may
+// succeed later and is not skipped, and 421 concerns the connection.
+bool MailingRun::skipRefusedCopy(SMTP* delivery) {
+    static const QRegularExpression permanent(QStringLiteral("^5\\d\\d(?:[ -]|$)"));
+    if (!m_member || !m_parts.settings.boolean(Key::ContinueAfterRefusal) ||
+        !permanent.match(delivery->failureReason()).hasMatch())
+        return false;
+    const Person member = *m_member;
+    memberNotMailed(delivery->failureReason());
+    m_everyCopyAccepted = false;
+    Q_EMIT copyRefused(member, delivery->failureReason());
+    // Its end hands over to the next member, as an accepted copy's does.
+    delivery->closeAfterRefusal();
     return true;
 }
 

@@ -32,7 +32,9 @@ class SmtpSession;
  * taken off the list whose copy is not accepted goes to the not-mailed list with the reason.
  * With the setting reuseConnection, up to 50 copies go over one connection; a copy whose
  * reused connection is lost before it went out whole, or refused with 421, goes again over a
- * new one, so that nobody is lost or mailed twice.
+ * new one, so that nobody is lost or mailed twice. With continueAfterRefusal, a member's copy
+ * refused with a permanent reply (5xx) is skipped and the run goes on; anything else that fails
+ * stops it as before.
  */
 class MailingRun : public QObject {
     Q_OBJECT
@@ -87,6 +89,11 @@ Q_SIGNALS:
     void completionActionWanted(int action);
     /** Nothing of this run is under way any more unless the user or a server acts. */
     void settled();
+    /** The server accepted the copy to recipient, whose Message-ID is messageId. */
+    void copyAccepted(const QString& recipient, const QString& messageId);
+    /** With continueAfterRefusal: the member's copy was refused for reason, and the run goes
+     * on. */
+    void copyRefused(const Person& member, const QString& reason);
 
 private:
     void pageReady(const QString& page);
@@ -110,6 +117,8 @@ private:
     /** A copy lost with its reused session before it went out whole goes again, first. */
     bool retryOnNewSession(SMTP* delivery);
     void closeOpenSession();
+    /** With continueAfterRefusal, a member's copy refused for good is skipped; true then. */
+    bool skipRefusedCopy(SMTP* delivery);
 
     Parts m_parts;
     State m_state = State::Idle;

@@ -1,5 +1,6 @@
 #include "controller/PelmoController.h"
 
+#include "addressbook/AddressBook.h"
 #include "attachments/AttachmentsController.h"
 #include "controller/MailSettings.h"
 #include "controller/MessageTemplate.h"
@@ -8,13 +9,30 @@
 #include "controller/SentRecipients.h"
 #include "smtp/SmtpClient.h"
 #include "util/CLog.h"
+#include "util/DataFolder.h"
 #include "util/DefaultMailClient.h"
 #include "util/LocalizedStrings.h"
+#include "util/PelmoException.h"
+#include "util/TextUtilities.h"
 
 #include <QCoreApplication>
+#include <QDateTime>
 #include <QTextDocument>
+#include <QUuid>
+
+#include <utility>
 
 using Key = MailSettings::Key;
+
+namespace {
+
+QString dataFolder() {
+    std::filesystem::path folder;
+    return GetOurApplicationSupportFolder(folder) ? QString::fromStdString(folder.string())
+                                                  : QString();
+}
+
+} // namespace
 
 PelmoController::PelmoController(PelmoView& view, AddressBook& book, PasswordStore& store,
                                  MailSettings& settings, QObject* parent)
@@ -22,9 +40,12 @@ PelmoController::PelmoController(PelmoView& view, AddressBook& book, PasswordSto
       content(new MessageTemplate(view, settings, this)), recipients(new SentRecipients(this)),
       notMailed(new NotMailedRecipients(this)),
       recipientSelection(new RecipientSelection(book, view, *recipients, this)),
-      attachments(new AttachmentsController(this)) {
+      attachments(new AttachmentsController(this)), ledger(new SentLedger(dataFolder(), this)) {
     connect(recipientSelection, &RecipientSelection::statusMessage, this,
             &PelmoController::statusMsg);
+    connect(ledger, &SentLedger::statusMessage, this, &PelmoController::statusMsg);
+    // Whoever the user let be mailed again must not come back after a crash.
+    connect(recipients, &SentRecipients::modelReset, ledger, &SentLedger::forgetAll);
 }
 
 PelmoController::~PelmoController() = default;
@@ -45,7 +66,40 @@ void PelmoController::applicationWillFinishLaunching() {
 }
 
 void PelmoController::applicationWillTerminate() {
+    ledger->close();
     StopLogging();
+}
+
+int PelmoController::findInterruptedRun() {
+    interrupted = ledger->claimInterrupted();
+    return static_cast<int>(interrupted.size());
+}
+
+void PelmoController::restoreInterruptedRun() {
+    if (interrupted.isEmpty())
+        return;
+    // Kept in this session's ledger too, in case this Pelmo does not end cleanly either.
+    const QString restoredRun = QUuid::createUuid().toString(QUuid::WithoutBraces);
+    int restored = 0;
+    for (const SentLedger::Entry& entry : std::as_const(interrupted)) {
+        if (recipients->recipientsContains(entry.address))
+            continue;
+        recipients->addRecipient(entry.address);
+        ledger->recordSent(restoredRun, entry.address, entry.messageId);
+        ++restored;
+    }
+    ledger->removeClaimed();
+    interrupted.clear();
+    statusMsg(restored == 1 ? LocalizedStringNS("Restored 1 recipient mailed before Pelmo stopped "
+                                                "unexpectedly; it is not mailed again.")
+                            : LocalizedStringNS("Restored %1 recipients mailed before Pelmo "
+                                                "stopped unexpectedly; they are not mailed again.")
+                                  .arg(restored));
+}
+
+void PelmoController::discardInterruptedRun() {
+    ledger->removeClaimed();
+    interrupted.clear();
 }
 
 QTextDocument* PelmoController::message() const {
@@ -66,10 +120,24 @@ void PelmoController::send() {
          *attachments, [this](const QString& host, int port) { return createSession(host, port); }},
         this);
     MailingRun* started = run;
+    const QString runId = QUuid::createUuid().toString(QUuid::WithoutBraces);
     connect(started, &MailingRun::statusMessage, this, &PelmoController::statusMsg);
+    connect(started, &MailingRun::copyAccepted, ledger,
+            [this, runId](const QString& recipient, const QString& messageId) {
+                ledger->recordSent(runId, recipient, messageId);
+            });
+    connect(started, &MailingRun::stateChanged, ledger, [this, runId](MailingRun::State state) {
+        if (state == MailingRun::State::Completed)
+            ledger->finishRun(runId);
+    });
+    connect(started, &MailingRun::copyRefused, this,
+            [this](const Person& member, const QString& reason) {
+                refusedMembers.append({member, reason});
+            });
     connect(started, &MailingRun::completionActionWanted, this,
             &PelmoController::applyCompletionAction);
     connect(started, &MailingRun::settled, this, [this, started] {
+        groupRefusedMembers();
         if (started == run)
             Q_EMIT runSettled();
         else if (!started->isDelivering())
@@ -88,6 +156,36 @@ void PelmoController::applyCompletionAction(int action) {
         QCoreApplication::quit();
     else if (action == 2)
         reset();
+}
+
+void PelmoController::groupRefusedMembers() {
+    if (refusedMembers.isEmpty())
+        return;
+    const QList<QPair<Person, QString>> refused = std::exchange(refusedMembers, {});
+    const QString stem =
+        LocalizedStringNS("Not delivered %1").arg(DateDescription(QDateTime::currentDateTime()));
+    QString name = stem;
+    for (int n = 2; addressBook.groupNamed(name); ++n)
+        name = QStringLiteral("%1 (%2)").arg(stem).arg(n);
+    try {
+        const qint64 group = addressBook.addGroup(name);
+        for (const auto& [member, reason] : refused) {
+            addressBook.addMember(group, member.id);
+            statusMsg(LocalizedStringNS("Not delivered to %1 <%2>: %3")
+                          .arg(member.fullName(), member.primaryEmail(), reason));
+        }
+    } catch (const PelmoException& failure) {
+        return statusMsg(LocalizedStringNS("The group \"%1\" could not be made: %2")
+                             .arg(name, failure.reason()));
+    }
+    statusMsg(refused.size() == 1
+                  ? LocalizedStringNS("1 recipient refused is in the group \"%1\": send to it "
+                                      "to try again.")
+                        .arg(name)
+                  : LocalizedStringNS("%1 recipients refused are in the group \"%2\": send to "
+                                      "it to try again.")
+                        .arg(refused.size())
+                        .arg(name));
 }
 
 SmtpSession* PelmoController::createSession(const QString& host, int port) {

@@ -4,6 +4,7 @@
 #include "browser/FrontPageQuery.h"
 #include "controller/MailingRun.h"
 #include "controller/PelmoView.h"
+#include "controller/SentLedger.h"
 
 #include <QList>
 #include <QObject>
@@ -49,8 +50,22 @@ public:
     void startUp();
     /** The application is about to finish launching: starts the activity log. */
     void applicationWillFinishLaunching();
-    /** The application terminates: stops the activity log. */
+    /** The application terminates: stops the activity log; a clean quit forgets the sent
+     * ledger. */
     void applicationWillTerminate();
+
+    // A run an earlier Pelmo did not finish (it was killed, crashed or lost power).
+
+    /**
+     * Looks for the sent ledgers that Pelmos which ended uncleanly left, and answers how many
+     * recipients their unfinished runs mailed (0 when none). They stay claimed, for
+     * restoreInterruptedRun() or discardInterruptedRun(), until this Pelmo ends.
+     */
+    int findInterruptedRun();
+    /** Puts those recipients in the sent list, so that Send mails only the others. */
+    void restoreInterruptedRun();
+    /** Forgets those recipients: their ledgers are removed. */
+    void discardInterruptedRun();
 
     PelmoView& view() const { return window; }
     MailSettings& settings() const { return defaults; }
@@ -168,6 +183,8 @@ Q_SIGNALS:
 private:
     SmtpSession* createSession(const QString& host, int port);
     void applyCompletionAction(int action);
+    /** Puts the members refused in this run, if any, into a new "Not delivered" group. */
+    void groupRefusedMembers();
     void frontPageAnswered(const QString& url, const QString& title, const QString& hint,
                            const QString& why);
 
@@ -184,4 +201,8 @@ private:
     QPointer<MailingRun> run;
     std::optional<FrontPageQuery::Places> frontPagePlaces;
     QPointer<FrontPageQuery> frontPageQuery;
+    SentLedger* ledger;
+    QList<SentLedger::Entry> interrupted;
+    /** The members whose copy was refused while the run went on, with the server's reason. */
+    QList<QPair<Person, QString>> refusedMembers;
 };

@@ -27,6 +27,7 @@
 #include <QLabel>
 #include <QLineEdit>
 #include <QMenuBar>
+#include <QMessageBox>
 #include <QMouseEvent>
 #include <QProgressBar>
 #include <QPushButton>
@@ -477,6 +478,33 @@ void MainWindow::alert(const QString& title, const QString& informativeText) {
 
 void MainWindow::beep() {
     QApplication::beep();
+}
+
+void MainWindow::offerInterruptedRun(int mailed) {
+    auto* box =
+        new QMessageBox(QMessageBox::Question, windowTitle(),
+                        LocalizedStringNS("Pelmo stopped unexpectedly during a mailing run."),
+                        QMessageBox::NoButton, this);
+    box->setObjectName(QStringLiteral("interruptedRun"));
+    box->setInformativeText(
+        (mailed == 1
+             ? LocalizedStringNS("1 recipient of that run was mailed already.")
+             : LocalizedStringNS("%1 recipients of that run were mailed already.").arg(mailed)) +
+        QLatin1Char(' ') +
+        LocalizedStringNS("Restore them to the Sent Recipients list, so that Send mails only "
+                          "those not yet mailed?"));
+    QPushButton* restore = box->addButton(LocalizedStringNS("Restore"), QMessageBox::AcceptRole);
+    QPushButton* forget = box->addButton(LocalizedStringNS("Forget"), QMessageBox::DestructiveRole);
+    box->setDefaultButton(restore);
+    box->setWindowModality(Qt::WindowModal);
+    box->setAttribute(Qt::WA_DeleteOnClose);
+    connect(box, &QMessageBox::finished, this, [this, box, restore, forget] {
+        if (box->clickedButton() == restore)
+            m_controller->restoreInterruptedRun();
+        else if (box->clickedButton() == forget)
+            m_controller->discardInterruptedRun();
+    });
+    box->open();
 }
 
 void MainWindow::showPeoplePicker() {

@@ -80,6 +80,12 @@ public:
     void beep() override;
 
     /** Brings the people picker to the front. */
+    /**
+     * Asks, without blocking, whether the recipients an unfinished run of an earlier Pelmo
+     * mailed go into the sent list (Restore) or are forgotten (Forget); closing the question
+     * leaves them for the next start.
+     */
+    void offerInterruptedRun(int mailed);
     void showPeoplePicker();
     /** Brings the attachments window to the front. */
     void showAttachments();

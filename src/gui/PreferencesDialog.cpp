@@ -160,6 +160,10 @@ QGroupBox* PreferencesDialog::createMessage() {
     form->addRow(QString(), m_plainAlternative);
     addText(form, LocalizedKey("Unsubscribe address:"), Key::ListUnsubscribe)
         ->setPlaceholderText(LocalizedStringNS("mailto: or https: address (optional)"));
+    m_continueAfterRefusal = new QCheckBox(
+        LocalizedStringNS("Go on when the server refuses a recipient (and group those refused)"));
+    nameAfter(m_continueAfterRefusal, Key::ContinueAfterRefusal);
+    form->addRow(QString(), m_continueAfterRefusal);
     return box;
 }
 
@@ -225,6 +229,7 @@ void PreferencesDialog::load() {
     m_useSSL->setChecked(m_settings.boolean(Key::UseSSL));
     m_reuseConnection->setChecked(m_settings.boolean(Key::ReuseConnection));
     m_plainAlternative->setChecked(m_settings.boolean(Key::AddPlainTextAlternative));
+    m_continueAfterRefusal->setChecked(m_settings.boolean(Key::ContinueAfterRefusal));
     // Absent, the check is on.
     m_checkForUpdates->setChecked(!m_settings.contains(Key::CheckForSoftwareUpdates) ||
                                   m_settings.boolean(Key::CheckForSoftwareUpdates));
@@ -258,6 +263,7 @@ void PreferencesDialog::save() {
     m_settings.setValue(Key::UseSSL, m_useSSL->isChecked());
     m_settings.setValue(Key::ReuseConnection, m_reuseConnection->isChecked());
     m_settings.setValue(Key::AddPlainTextAlternative, m_plainAlternative->isChecked());
+    m_settings.setValue(Key::ContinueAfterRefusal, m_continueAfterRefusal->isChecked());
     m_settings.setValue(Key::CheckForSoftwareUpdates, m_checkForUpdates->isChecked());
     if (m_password->text() != m_loadedPassword)
         savePassword();

@@ -65,6 +65,7 @@ private:
     QCheckBox* m_useSSL = nullptr;
     QCheckBox* m_reuseConnection = nullptr;
     QCheckBox* m_plainAlternative = nullptr;
+    QCheckBox* m_continueAfterRefusal = nullptr;
     QCheckBox* m_checkForUpdates = nullptr;
     QLineEdit* m_password = nullptr;
     QLabel* m_passwordNote = nullptr;

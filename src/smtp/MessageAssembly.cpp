@@ -313,6 +313,10 @@ QString MessageAssembly::envelopeSender() const {
     return message->sender;
 }
 
+QString MessageAssembly::messageId() const {
+    return QString::fromUtf8(g_mime_message_get_message_id(message->mime.get()));
+}
+
 QStringList MessageAssembly::envelopeRecipients() const {
     return message->recipient.isEmpty() ? QStringList() : QStringList{message->recipient};
 }

@@ -46,8 +46,7 @@ public:
      * addBodyPart() makes it: a reader shows the last it can, and spam filters trust a
      * message that has both.
      */
-    void addAlternativeBodyParts(const QString& plain, const QString& html,
-                                 int characterSetIndex);
+    void addAlternativeBodyParts(const QString& plain, const QString& html, int characterSetIndex);
     /**
      * Adds List-Unsubscribe (RFC 2369 3.2) with address when it is a mailto: or https: URL,
      * and with an https: one List-Unsubscribe-Post for one-click unsubscribing (RFC 8058 3.1);
@@ -73,6 +72,8 @@ public:
     QString envelopeSender() const;
     /** The recipient's address, for RCPT TO; empty before setTo. */
     QStringList envelopeRecipients() const;
+    /** The Message-ID made by setFrom, without its angle brackets; empty before. */
+    QString messageId() const;
 
 private:
     struct Message;

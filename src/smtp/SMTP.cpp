@@ -105,6 +105,7 @@ void SMTP::setMessage() {
     // A file that has gone or cannot be read is left out without a word.
     for (const QString& path : std::as_const(m_request.attachments))
         message.addAttachment(path);
+    m_messageId = message.messageId();
     m_session->setMessage(message.toBytes(), message.envelopeSender(),
                           message.envelopeRecipients());
     connectSession();
@@ -246,6 +247,13 @@ void SMTP::messageNotSent() {
     // no later than the server leaves it, so that the copy can go again over a new one.
     if (m_keep && reply.startsWith(QLatin1String("421")) && m_session)
         m_session->close();
+}
+
+void SMTP::closeAfterRefusal() {
+    if (m_state != State::Aborted || !m_session)
+        return;
+    m_state = State::Closing;
+    m_session->close();
 }
 
 void SMTP::reportFailureReason() {

@@ -74,6 +74,10 @@ public:
      */
     const QString& failureReason() const { return m_failure; }
     const DeliveryRequest& request() const { return m_request; }
+    /** The message's Message-ID, once the message is built. */
+    const QString& messageId() const { return m_messageId; }
+    /** After refused(): ends the conversation, so that the delivery ends as Ended. */
+    void closeAfterRefusal();
 
 Q_SIGNALS:
     /** A line for the status line and the activity log. */
@@ -115,6 +119,7 @@ private:
     State m_state = State::Created;
     bool m_succeeded = false;
     QString m_failure;
+    QString m_messageId;
     bool m_keep = false;
     bool m_messageWritten = false;
 };

@@ -14,7 +14,7 @@ import secrets
 import ssl
 import sys
 
-from aiosmtpd.smtp import SMTP, AuthResult, LoginPassword, auth_mechanism
+from aiosmtpd.smtp import SMTP, AuthResult, LoginPassword, auth_mechanism, syntax
 
 
 class Handler:
@@ -53,6 +53,18 @@ class Handler:
         return AuthResult(success=ok, handled=False)
 
 
+class SlowDataSMTP(SMTP):
+    """Waits --data-delay seconds before answering DATA, so that a test can stop the client
+    while a copy is under way and before any of its text was sent."""
+
+    data_delay = 0.0
+
+    @syntax("DATA")
+    async def smtp_DATA(self, arg):
+        await asyncio.sleep(self.data_delay)
+        await super().smtp_DATA(arg)
+
+
 if __name__ == "__main__":
     parser = argparse.ArgumentParser(description=__doc__)
     parser.add_argument("--tls", choices=["none", "starttls", "implicit"], default="none")
@@ -64,9 +76,12 @@ if __name__ == "__main__":
     parser.add_argument("--refuse-recipient", action="append", default=[])
     parser.add_argument("--size", type=int, default=10 * 1024 * 1024)
     parser.add_argument("--lifetime", type=float, default=60.0)
+    parser.add_argument("--data-delay", type=float, default=0.0,
+                        help="seconds to wait before answering DATA")
     args = parser.parse_args()
     logging.getLogger("mail.log").setLevel(logging.CRITICAL)
     handler = Handler(args)
+    SlowDataSMTP.data_delay = args.data_delay
     context = ssl.create_default_context(ssl.Purpose.CLIENT_AUTH)
     if args.tls != "none":
         context.load_cert_chain(args.cert, args.key)
@@ -75,7 +90,7 @@ if __name__ == "__main__":
 
     def new_session():
         # With STARTTLS, AUTH is announced only once TLS is up, as real servers do.
-        return SMTP(handler, hostname="localhost", tls_context=starttls,
+        return SlowDataSMTP(handler, hostname="localhost", tls_context=starttls,
                     require_starttls=args.require_starttls, auth_require_tls=starttls is not None,
                     authenticator=handler.authenticate, data_size_limit=args.size, loop=loop)
 
