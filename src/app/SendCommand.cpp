@@ -117,6 +117,8 @@ void loadMessage(const QString& path, QTextDocument& body) {
 }
 
 void writeCopiesTo(PelmoController& controller, const QString& directory) {
+    // Nobody is mailed, so a crash must not make these copies count as sent.
+    controller.setLedgerKept(false);
     auto copies = std::make_shared<int>(0);
     controller.setSessionFactory([directory, copies](const QString&, int) -> SmtpSession* {
         const QString name = QStringLiteral("%1.eml").arg(++*copies, 4, 10, QLatin1Char('0'));

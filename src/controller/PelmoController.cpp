@@ -122,10 +122,11 @@ void PelmoController::send() {
     MailingRun* started = run;
     const QString runId = QUuid::createUuid().toString(QUuid::WithoutBraces);
     connect(started, &MailingRun::statusMessage, this, &PelmoController::statusMsg);
-    connect(started, &MailingRun::copyAccepted, ledger,
-            [this, runId](const QString& recipient, const QString& messageId) {
-                ledger->recordSent(runId, recipient, messageId);
-            });
+    if (ledgerKept)
+        connect(started, &MailingRun::copyAccepted, ledger,
+                [this, runId](const QString& recipient, const QString& messageId) {
+                    ledger->recordSent(runId, recipient, messageId);
+                });
     connect(started, &MailingRun::stateChanged, ledger, [this, runId](MailingRun::State state) {
         if (state == MailingRun::State::Completed)
             ledger->finishRun(runId);

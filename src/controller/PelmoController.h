@@ -93,6 +93,8 @@ public:
     MailingRun* currentRun() const { return run; }
     /** Replaces how sessions are made (a dry run writes files; tests hand in their own). */
     void setSessionFactory(MailingRun::SessionFactory factory);
+    /** Whether accepted copies go into the sent ledger (not for copies written to files). */
+    void setLedgerKept(bool kept) { ledgerKept = kept; }
 
     // Status, alerts, the log.
 
@@ -198,6 +200,7 @@ private:
     RecipientSelection* recipientSelection;
     AttachmentsController* attachments;
     MailingRun::SessionFactory sessionFactory;
+    bool ledgerKept = true;
     QPointer<MailingRun> run;
     std::optional<FrontPageQuery::Places> frontPagePlaces;
     QPointer<FrontPageQuery> frontPageQuery;
