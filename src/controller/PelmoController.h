@@ -4,6 +4,7 @@
 #include "browser/FrontPageQuery.h"
 #include "controller/MailingRun.h"
 #include "controller/PelmoView.h"
+#include "controller/RunPace.h"
 
 #include <QList>
 #include <QObject>
@@ -78,6 +79,8 @@ public:
     MailingRun* currentRun() const { return run; }
     /** Replaces how sessions are made (a dry run writes files; tests hand in their own). */
     void setSessionFactory(MailingRun::SessionFactory factory);
+    /** The pace every run keeps to; its history spans the runs of this window. */
+    RunPace& runPace() { return pace; }
 
     // Status, alerts, the log.
 
@@ -181,6 +184,7 @@ private:
     RecipientSelection* recipientSelection;
     AttachmentsController* attachments;
     MailingRun::SessionFactory sessionFactory;
+    RunPace pace;
     QPointer<MailingRun> run;
     std::optional<FrontPageQuery::Places> frontPagePlaces;
     QPointer<FrontPageQuery> frontPageQuery;

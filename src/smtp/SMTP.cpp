@@ -248,6 +248,13 @@ void SMTP::messageNotSent() {
         m_session->close();
 }
 
+// RFC 5321 4.1.1.10: QUIT; the session reports connectionTerminated once the server has
+// answered, and the delivery ends as Ended.
+void SMTP::closeAfterRefusal() {
+    if (m_state == State::Aborted && m_session)
+        m_session->close();
+}
+
 void SMTP::reportFailureReason() {
     if (m_session && !m_session->errorString().isEmpty()) {
         status(m_session->errorString());

@@ -60,6 +60,8 @@ public:
     void setKeepSession(bool keep) { m_keep = keep; }
     /** The session a Kept delivery left open, reparented to nothing; the caller takes it. */
     SmtpSession* takeSession();
+    /** Closes the connection a refused message left open; nothing in any other state. */
+    void closeAfterRefusal();
     /** Whether the message went out whole before the delivery ended, so that it may have
      * arrived even though its acceptance was never read. */
     bool messageWritten() const { return m_messageWritten; }
