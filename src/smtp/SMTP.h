@@ -32,7 +32,7 @@ public:
         AwaitingCredentials, ///< the login asked for, not yet answered
         Authenticating,      ///< credentials sent
         Sending,             ///< message handed to the session
-        Closing,             ///< QUIT sent after success or a refused login
+        Closing,             ///< QUIT sent after success, a refused login or a refused message
         Stalled,             ///< an unknown login mechanism: nothing sent, connection open
         Aborted,             ///< the message was refused; the connection is left open
         Halted,              ///< a failure stopped the delivery; the session is closed
@@ -60,7 +60,7 @@ public:
     void setKeepSession(bool keep) { m_keep = keep; }
     /** The session a Kept delivery left open, reparented to nothing; the caller takes it. */
     SmtpSession* takeSession();
-    /** Closes the connection a refused message left open; nothing in any other state. */
+    /** Closes the connection a refused message left open, once; nothing in any other state. */
     void closeAfterRefusal();
     /** Whether the message went out whole before the delivery ended, so that it may have
      * arrived even though its acceptance was never read. */

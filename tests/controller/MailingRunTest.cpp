@@ -131,6 +131,10 @@ const Step showPage = [](Run& run) {
     const QString page = run.controller->messageTemplate().getWebPageOrFileContents();
     run.note("page: " + (page.isNull() ? QStringLiteral("(none)") : page));
 };
+const Step quickBackOffs = [](Run& run) {
+    using namespace std::chrono_literals;
+    run.controller->runPace().setRetrySchedule({10ms, 20ms, 40ms});
+};
 // Real SMTP sessions with aiosmtpd started with arguments, and back-offs of milliseconds.
 Step server(const QStringList& arguments) {
     return [=](Run& run) {
@@ -140,7 +144,7 @@ Step server(const QStringList& arguments) {
         TestSettings::set("serverAddress", "127.0.0.1");
         TestSettings::set("serverPort", run.smtp->port());
         run.controller->setSessionFactory(nullptr);
-        run.controller->runPace().setRetrySchedule({10ms, 20ms, 40ms});
+        quickBackOffs(run);
     };
 }
 // Whom the server took each message for, in order.
@@ -272,6 +276,12 @@ const Scenario kScenarios[] = {
     {"temporary_refusal_retried",
      {setting("retryTemporaryFailures", true), server({"--defer-recipient", "bob@example.org=2"}),
       group(kClub), choose, send, received}},
+    // A 421 on the kept connection goes again at once over a new one; refused there too, it
+    // waits its first back-off.
+    {"reuse_connection_421_busy",
+     {setting("reuseConnection", true), setting("retryTemporaryFailures", true), quickBackOffs,
+      with<QByteArray>(&Script::refusal, "421 4.7.0 Too busy\r\n"), with(&Script::refuseAtSend, 2),
+      with(&Script::refusals, 2), group(kClub + QStringList{"cy@example.org"}), choose, send}},
     // After the last retry is refused too, the run stops with the server's reason.
     {"temporary_refusal_given_up",
      {setting("retryTemporaryFailures", true), server({"--defer-recipient", "ann@example.org=9"}),
