@@ -20,10 +20,13 @@ namespace Commands {
 
 namespace {
 
+using Key = MailSettings::Key;
+
 constexpr char kUsage[] =
     "usage: pelmo send [--group NAME | --to ADDRESS [--name NAME]] [--subject TEXT]\n"
     "                  [--message FILE] [--page URL | --front-page] [--attach FILE]...\n"
-    "                  [--set KEY=VALUE]... [--dry-run DIR] [--resume]\n";
+    "                  [--delay SECONDS] [--max-per-hour N] [--set KEY=VALUE]...\n"
+    "                  [--dry-run DIR] [--resume]\n";
 
 struct SendOptions {
     QString group, to, name, subject, messageFile, page, dryRunDirectory;
@@ -70,6 +73,22 @@ SendOptions parse(const QStringList& args) {
             options.attachments << valueAfter(args, i);
         } else if (option == QLatin1String("--dry-run")) {
             options.dryRunDirectory = valueAfter(args, i);
+        } else if (option == QLatin1String("--delay")) {
+            const QString seconds = valueAfter(args, i);
+            bool isNumber = false;
+            const double value = seconds.toDouble(&isNumber);
+            if (!isNumber || !(value >= 0 && value <= MailSettings::kMaxDelaySeconds))
+                throw UsageError(QStringLiteral("--delay takes a number of seconds from 0 to %1")
+                                     .arg(MailSettings::kMaxDelaySeconds));
+            options.settings.append({MailSettings::name(Key::DelayBetweenMessages), seconds});
+        } else if (option == QLatin1String("--max-per-hour")) {
+            const QString copies = valueAfter(args, i);
+            bool isNumber = false;
+            const int value = copies.toInt(&isNumber);
+            if (!isNumber || value < 1 || value > MailSettings::kMaxMessagesPerHour)
+                throw UsageError(QStringLiteral("--max-per-hour takes a whole number from 1 to %1")
+                                     .arg(MailSettings::kMaxMessagesPerHour));
+            options.settings.append({MailSettings::name(Key::MaxMessagesPerHour), copies});
         } else if (option == QLatin1String("--set")) {
             const QString pair = valueAfter(args, i);
             const qsizetype equals = pair.indexOf(QLatin1Char('='));

@@ -73,6 +73,15 @@ const Row kTable[] = {
     {Key::ListUnsubscribe, "listUnsubscribe", QVariant(), nullptr, nullptr},
     // A member's copy refused for good is skipped instead of stopping the run.
     {Key::ContinueAfterRefusal, "continueAfterRefusal", false, nullptr, nullptr},
+    // The pace of a run, for servers that limit how much mail they take and how fast.
+    {Key::DelayBetweenMessages, "delayBetweenMessages", 0, "BadDelay",
+     LocalizedKey("The 'Delay between messages:' preference value is not a number of seconds "
+                  "from 0 to 86400.")},
+    {Key::MaxMessagesPerHour, "maxMessagesPerHour", 0, "BadHourlyLimit",
+     LocalizedKey("The 'At most per hour:' preference value is not a whole number from 0 (no "
+                  "limit) to 100000.")},
+    // A copy refused for now (421, 450, 451, 452) goes again after a back-off.
+    {Key::RetryTemporaryFailures, "retryTemporaryFailures", false, nullptr, nullptr},
 };
 
 const Row& rowOf(Key key) {
@@ -92,7 +101,7 @@ std::filesystem::path pathOf(const QString& name) {
 
 MailSettings::MailSettings()
     : store(QString::fromLatin1(kOrganisationName), QString::fromLatin1(kApplicationName)) {
-    static_assert(std::size(kTable) == static_cast<size_t>(Key::ContinueAfterRefusal) + 1);
+    static_assert(std::size(kTable) == static_cast<size_t>(Key::RetryTemporaryFailures) + 1);
     // The file may hold the password when no keyring answers: made private before anything is
     // written to it, and tightened when an older Pelmo left it readable.
     const QFileInfo file(store.fileName());
@@ -165,6 +174,29 @@ int MailSettings::port() {
     if (static_cast<unsigned>(stored) - 1u > 65364u)
         throw failureOf(Key::ServerPort);
     return stored;
+}
+
+double MailSettings::delayBetweenMessages() {
+    const QVariant stored = value(Key::DelayBetweenMessages);
+    if (!stored.isValid())
+        return 0;
+    bool isNumber = false;
+    const double seconds = stored.toString().trimmed().toDouble(&isNumber);
+    // Written as !(in range) so that NaN fails too.
+    if (!isNumber || !(seconds >= 0 && seconds <= kMaxDelaySeconds))
+        throw failureOf(Key::DelayBetweenMessages);
+    return seconds;
+}
+
+int MailSettings::maxMessagesPerHour() {
+    const QVariant stored = value(Key::MaxMessagesPerHour);
+    if (!stored.isValid())
+        return 0;
+    bool isNumber = false;
+    const int copies = stored.toString().trimmed().toInt(&isNumber);
+    if (!isNumber || copies < 0 || copies > kMaxMessagesPerHour)
+        throw failureOf(Key::MaxMessagesPerHour);
+    return copies;
 }
 
 bool MailSettings::isOverridden(Key key) const {

@@ -42,7 +42,14 @@ public:
         AddPlainTextAlternative,
         ListUnsubscribe,
         ContinueAfterRefusal,
+        DelayBetweenMessages,
+        MaxMessagesPerHour,
+        RetryTemporaryFailures,
     };
+
+    /** The bounds of the pace settings, for the forms and the command line that set them. */
+    static constexpr int kMaxDelaySeconds = 86400;
+    static constexpr int kMaxMessagesPerHour = 100000;
 
     /** The store of the current user; makes its folder and file private. */
     MailSettings();
@@ -72,6 +79,12 @@ public:
     QString required(Key key);
     /** The server port, 1 to 65365 inclusive; throws BadPort otherwise (missing is 0). */
     int port();
+    /** Seconds between two copies, fractions allowed (missing is 0); throws BadDelay unless
+     *  a number from 0 to kMaxDelaySeconds. */
+    double delayBetweenMessages();
+    /** Copies in any hour, 0 for no limit (missing is 0); throws BadHourlyLimit unless a whole
+     *  number from 0 to kMaxMessagesPerHour. */
+    int maxMessagesPerHour();
     bool isOverridden(Key key) const;
 
     /** Stores value (an empty string removes the key) and writes the file at once. */

@@ -8,6 +8,7 @@
 #include "controller/PasswordStore.h"
 #include "controller/PelmoView.h"
 #include "controller/RecipientSelection.h"
+#include "controller/RunPace.h"
 #include "controller/SentRecipients.h"
 #include "relink/Relink.h"
 #include "relink/SuffixMap.h"
@@ -29,7 +30,12 @@ QString now() {
 
 } // namespace
 
-MailingRun::MailingRun(const Parts& parts, QObject* parent) : QObject(parent), m_parts(parts) {}
+MailingRun::MailingRun(const Parts& parts, QObject* parent) : QObject(parent), m_parts(parts) {
+    m_paceTimer.setSingleShot(true);
+    // A coarse timer may fire a little early, and the copy would then wait once more.
+    m_paceTimer.setTimerType(Qt::PreciseTimer);
+    connect(&m_paceTimer, &QTimer::timeout, this, &MailingRun::paceElapsed);
+}
 
 MailingRun::~MailingRun() = default;
 
@@ -43,7 +49,7 @@ void MailingRun::enter(State state) {
 void MailingRun::settleUnlessDelivering() {
     const bool waiting = m_delivery && m_delivery->state() != SMTP::State::Aborted &&
                          m_delivery->state() != SMTP::State::Stalled;
-    if (!waiting && m_state != State::PreparingPage)
+    if (!waiting && !m_paceTimer.isActive() && m_state != State::PreparingPage)
         Q_EMIT settled();
 }
 
@@ -98,7 +104,8 @@ void MailingRun::beginDeliveries() {
         sendMember();
     } else {
         m_parts.view.setProgressBusy();
-        deliver();
+        if (!waitForPace(1, 1))
+            deliver();
     }
     settleUnlessDelivering();
 }
@@ -111,6 +118,9 @@ bool MailingRun::sendMember() {
         endRun();
         return false;
     }
+    if (waitForPace(static_cast<int>(people->size()),
+                    static_cast<int>(m_parts.view.progressMaximum())))
+        return true;
     PelmoView& view = m_parts.view;
     view.setProgressValue(view.progressMaximum() - static_cast<double>(people->size()) + 1.0);
     const Person person = m_parts.selection.takeFirst();
@@ -125,6 +135,78 @@ bool MailingRun::sendMember() {
         view.setTo(person.primaryEmail());
         deliver();
     }
+    return true;
+}
+
+bool MailingRun::nextCopy() {
+    if (m_parts.selection.getPeople() || m_stopSending)
+        return sendMember();
+    if (!waitForPace(1, 1))
+        deliver();
+    return true;
+}
+
+bool MailingRun::waitForPace(int left, int total) {
+    RunPace& pace = m_parts.pace;
+    MailSettings& settings = m_parts.settings;
+    try {
+        settings.sync();
+        pace.setDelay(std::chrono::round<RunPace::Duration>(
+            std::chrono::duration<double>(settings.delayBetweenMessages())));
+        pace.setHourlyLimit(settings.maxMessagesPerHour());
+    } catch (const PelmoException& failure) {
+        halt(failure);
+        return true;
+    }
+    const auto now = RunPace::Clock::now();
+    const RunPace::Duration wait = pace.waitBefore(now);
+    if (wait.count() <= 0)
+        return false;
+    status(LocalizedStringNS("Waiting %1 before the next message: %2 of %3 left, about %4 to go.")
+               .arg(RunPace::describe(wait))
+               .arg(left)
+               .arg(total)
+               .arg(RunPace::describe(pace.timeFor(left, now))));
+    m_paceTimer.start(wait);
+    enter(State::Waiting);
+    return true;
+}
+
+void MailingRun::paceElapsed() {
+    enter(State::Delivering);
+    if (!nextCopy())
+        finishRun(false);
+    settleUnlessDelivering();
+}
+
+// RFC 5321 4.2.1, 4.2.5: after a 4yz reply to RCPT or at the end of DATA the copy was not taken,
+// and may be sent again; these four are the server's busy or full moments, worth waiting out.
+bool MailingRun::retryLater(SMTP* delivery) {
+    static const QStringList kTemporary{QStringLiteral("421"), QStringLiteral("450"),
+                                        QStringLiteral("451"), QStringLiteral("452")};
+    const QString& reply = delivery->failureReason();
+    const QString recipient = delivery->request().recipient;
+    if (recipient != m_retryRecipient) {
+        m_retryRecipient = recipient;
+        m_retries = 0;
+    }
+    const QList<RunPace::Duration>& backOffs = m_parts.pace.retrySchedule();
+    if (m_stopSending || !m_parts.settings.boolean(Key::RetryTemporaryFailures) ||
+        m_retries >= backOffs.size() || delivery->succeeded() ||
+        !kTemporary.contains(reply.left(3)) ||
+        (reply.size() > 3 && reply[3] != u' ' && reply[3] != u'-'))
+        return false;
+    const RunPace::Duration backOff = m_backOff = backOffs.at(m_retries++);
+    status(LocalizedStringNS("The server refused the message for now: trying again in %1 "
+                             "(retry %2 of %3).")
+               .arg(RunPace::describe(backOff))
+               .arg(m_retries)
+               .arg(backOffs.size()));
+    if (m_member)
+        m_parts.selection.putBack({*m_member});
+    m_member.reset();
+    m_retried = delivery;
+    delivery->closeAfterRefusal();
     return true;
 }
 
@@ -146,6 +228,7 @@ void MailingRun::deliver() {
         new SMTP(request, open ? open : m_parts.createSession(request.server, request.port), this);
     delivery->setKeepSession(m_parts.settings.boolean(Key::ReuseConnection));
     m_delivery = delivery;
+    m_parts.pace.copyStarted(RunPace::Clock::now());
     enter(State::Delivering);
     connect(delivery, &SMTP::statusMessage, this, &MailingRun::statusMessage);
     connect(delivery, &SMTP::accepted, this, [this, delivery](const QString& recipient) {
@@ -155,7 +238,7 @@ void MailingRun::deliver() {
         m_parts.notMailed.removeAddress(recipient);
     });
     connect(delivery, &SMTP::refused, this, [this, delivery] {
-        if (retryOnNewSession(delivery) || skipRefusedCopy(delivery))
+        if (retryOnNewSession(delivery) || retryLater(delivery) || skipRefusedCopy(delivery))
             return;
         memberNotMailed(delivery->failureReason());
         m_everyCopyAccepted = false;
@@ -309,6 +392,7 @@ void MailingRun::askCredentials(const std::function<void(const Credentials&)>& a
 }
 
 void MailingRun::deliveryFinished(SMTP* delivery) {
+    m_parts.pace.copyEnded(RunPace::Clock::now());
     delivery->deleteLater();
     if (m_delivery == delivery)
         m_delivery = nullptr;
@@ -316,8 +400,10 @@ void MailingRun::deliveryFinished(SMTP* delivery) {
         m_openSession = delivery->takeSession();
         m_openSession->setParent(this);
     } else if (delivery == m_retried || retryOnNewSession(delivery)) {
-        // The copy goes again: this delivery neither failed the run nor mailed anyone.
-        if (!sendMember())
+        // The copy goes again: this delivery neither failed the run nor mailed anyone. A
+        // back-off counts from the end of the refused try.
+        m_parts.pace.holdUntil(RunPace::Clock::now() + std::exchange(m_backOff, {}));
+        if (!nextCopy())
             finishRun(false);
         return settleUnlessDelivering();
     }
@@ -404,6 +490,8 @@ void MailingRun::finishRun(bool succeeded) {
 }
 
 void MailingRun::abort() {
+    // A wait ends at once; whoever it held back stays pending.
+    m_paceTimer.stop();
     closeOpenSession();
     m_parts.view.stopProgressAnimation();
     m_stopSending = true;

@@ -1,10 +1,12 @@
 #pragma once
 
 #include "addressbook/Person.h"
+#include "controller/RunPace.h"
 #include "smtp/DeliveryRequest.h"
 
 #include <QObject>
 #include <QPointer>
+#include <QTimer>
 
 #include <functional>
 #include <optional>
@@ -35,6 +37,13 @@ class SmtpSession;
  * new one, so that nobody is lost or mailed twice. With continueAfterRefusal, a member's copy
  * refused with a permanent reply (5xx) is skipped and the run goes on; anything else that fails
  * stops it as before.
+ *
+ * The pace (see RunPace) may hold a copy back: the run then waits on a timer, says how long and
+ * how much is left, and Stop ends it at once with the rest pending. With the setting
+ * retryTemporaryFailures, a copy the server refuses for now (421, 450, 451 or 452, which say
+ * it was not taken) goes again after each back-off of the pace's retry schedule, and the run
+ * stops as for any refusal only when the last try is refused too. A 421 on a reused connection
+ * first goes again at once over a new one, as above, without using up a retry.
  */
 class MailingRun : public QObject {
     Q_OBJECT
@@ -53,12 +62,15 @@ public:
         PasswordStore& passwords;
         const AttachmentsController& attachments;
         SessionFactory createSession;
+        /** Outlives runs, so that a run started again keeps to the same hour. */
+        RunPace& pace;
     };
 
     enum class State {
         Idle,          ///< start() not yet called
         PreparingPage, ///< the web page is downloading; Stop ends the run at once
         Delivering,    ///< a copy is on its way (the To field's, or member n's)
+        Waiting,       ///< the pace holds the next copy back until a timer fires
         Stalled,       ///< cannot go on by itself (no address, a time-out, an unknown login
                        ///< mechanism); the button still reads Stop
         Halted,        ///< a setting or the message failed: the button reads Send, nothing starts
@@ -99,6 +111,15 @@ private:
     void pageReady(const QString& page);
     void beginDeliveries();
     bool sendMember();
+    /** The next member's copy, or the To field's again after a temporary refusal. */
+    bool nextCopy();
+    /** Reads the pace settings and, when the next copy must wait, starts the timer and says how
+     *  long and how many of total are left; answers whether the copy waits (or the run halted
+     *  on a bad setting). */
+    bool waitForPace(int left, int total);
+    void paceElapsed();
+    /** A copy refused for now goes again after the next back-off, if any is left. */
+    bool retryLater(SMTP* delivery);
     void deliver();
     DeliveryRequest buildRequest();
     void askCredentials(const std::function<void(const Credentials&)>& answer);
@@ -138,4 +159,10 @@ private:
     bool m_onOpenSession = false;
     /** The delivery whose copy goes again over a new connection; its end is not a failure. */
     QPointer<SMTP> m_retried;
+    QTimer m_paceTimer;
+    /** The recipient whose copy was refused for now, and how often so far. */
+    QString m_retryRecipient;
+    int m_retries = 0;
+    /** How long the copy going again waits once its refused try has ended; zero for none. */
+    RunPace::Duration m_backOff{0};
 };

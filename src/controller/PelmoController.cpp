@@ -117,7 +117,8 @@ void PelmoController::send() {
         run->deleteLater();
     run = new MailingRun(
         {window, defaults, *content, *recipientSelection, *recipients, *notMailed, passwords,
-         *attachments, [this](const QString& host, int port) { return createSession(host, port); }},
+         *attachments, [this](const QString& host, int port) { return createSession(host, port); },
+         pace},
         this);
     MailingRun* started = run;
     const QString runId = QUuid::createUuid().toString(QUuid::WithoutBraces);

@@ -4,6 +4,7 @@
 #include "browser/FrontPageQuery.h"
 #include "controller/MailingRun.h"
 #include "controller/PelmoView.h"
+#include "controller/RunPace.h"
 #include "controller/SentLedger.h"
 
 #include <QList>
@@ -95,6 +96,8 @@ public:
     void setSessionFactory(MailingRun::SessionFactory factory);
     /** Whether accepted copies go into the sent ledger (not for copies written to files). */
     void setLedgerKept(bool kept) { ledgerKept = kept; }
+    /** The pace every run keeps to; its history spans the runs of this window. */
+    RunPace& runPace() { return pace; }
 
     // Status, alerts, the log.
 
@@ -201,6 +204,7 @@ private:
     AttachmentsController* attachments;
     MailingRun::SessionFactory sessionFactory;
     bool ledgerKept = true;
+    RunPace pace;
     QPointer<MailingRun> run;
     std::optional<FrontPageQuery::Places> frontPagePlaces;
     QPointer<FrontPageQuery> frontPageQuery;

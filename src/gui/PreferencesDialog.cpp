@@ -7,6 +7,7 @@
 #include <QCheckBox>
 #include <QComboBox>
 #include <QDialogButtonBox>
+#include <QDoubleSpinBox>
 #include <QFormLayout>
 #include <QGroupBox>
 #include <QHBoxLayout>
@@ -55,6 +56,7 @@ PreferencesDialog::PreferencesDialog(PasswordStore& passwords, MailSettings& set
     auto* right = new QVBoxLayout;
     right->addWidget(createServer());
     right->addWidget(createUpdates());
+    right->addWidget(createPace());
     right->addStretch(1);
     auto* columns = new QHBoxLayout;
     columns->addLayout(left, 1);
@@ -203,6 +205,29 @@ QGroupBox* PreferencesDialog::createMailLinks() {
     return box;
 }
 
+QGroupBox* PreferencesDialog::createPace() {
+    QFormLayout* form = nullptr;
+    QGroupBox* box = groupBox(LocalizedKey("Pace"), form);
+    m_delay = new QDoubleSpinBox;
+    nameAfter(m_delay, Key::DelayBetweenMessages);
+    m_delay->setRange(0, MailSettings::kMaxDelaySeconds);
+    m_delay->setDecimals(1);
+    m_delay->setSuffix(LocalizedStringNS(" s"));
+    form->addRow(LocalizedStringNS("Delay between messages:"), m_delay);
+    m_hourlyLimit = new QSpinBox;
+    nameAfter(m_hourlyLimit, Key::MaxMessagesPerHour);
+    m_hourlyLimit->setRange(0, MailSettings::kMaxMessagesPerHour);
+    m_hourlyLimit->setSpecialValueText(LocalizedStringNS("No limit"));
+    m_hourlyLimit->setToolTip(LocalizedStringNS("Messages in any hour, for servers that limit it"));
+    form->addRow(LocalizedStringNS("At most per hour:"), m_hourlyLimit);
+    m_retryTemporary =
+        new QCheckBox(LocalizedStringNS("Try again when the server is busy (after 30 s, 2 min, "
+                                        "8 min)"));
+    nameAfter(m_retryTemporary, Key::RetryTemporaryFailures);
+    form->addRow(QString(), m_retryTemporary);
+    return box;
+}
+
 void PreferencesDialog::showDefaultMailClient() {
     const QString client = DefaultMailClient();
     const bool pelmo = client == QLatin1String("pelmo.desktop");
@@ -233,6 +258,10 @@ void PreferencesDialog::load() {
     // Absent, the check is on.
     m_checkForUpdates->setChecked(!m_settings.contains(Key::CheckForSoftwareUpdates) ||
                                   m_settings.boolean(Key::CheckForSoftwareUpdates));
+    // A value the run would refuse shows as 0; the run says what is wrong with it.
+    m_delay->setValue(m_settings.value(Key::DelayBetweenMessages).toDouble());
+    m_hourlyLimit->setValue(m_settings.integer(Key::MaxMessagesPerHour));
+    m_retryTemporary->setChecked(m_settings.boolean(Key::RetryTemporaryFailures));
     loadPassword();
 }
 
@@ -265,6 +294,9 @@ void PreferencesDialog::save() {
     m_settings.setValue(Key::AddPlainTextAlternative, m_plainAlternative->isChecked());
     m_settings.setValue(Key::ContinueAfterRefusal, m_continueAfterRefusal->isChecked());
     m_settings.setValue(Key::CheckForSoftwareUpdates, m_checkForUpdates->isChecked());
+    m_settings.setValue(Key::DelayBetweenMessages, m_delay->value());
+    m_settings.setValue(Key::MaxMessagesPerHour, m_hourlyLimit->value());
+    m_settings.setValue(Key::RetryTemporaryFailures, m_retryTemporary->isChecked());
     if (m_password->text() != m_loadedPassword)
         savePassword();
 }

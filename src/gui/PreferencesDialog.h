@@ -7,6 +7,7 @@
 class PasswordStore;
 class QCheckBox;
 class QComboBox;
+class QDoubleSpinBox;
 class QFormLayout;
 class QGroupBox;
 class QLabel;
@@ -48,6 +49,7 @@ private:
     QGroupBox* createMessage();
     QGroupBox* createCompletion();
     QGroupBox* createMailLinks();
+    QGroupBox* createPace();
     QGroupBox* createUpdates();
     void showDefaultMailClient();
     QLineEdit* addText(QFormLayout* form, const char* label, MailSettings::Key key);
@@ -67,6 +69,9 @@ private:
     QCheckBox* m_plainAlternative = nullptr;
     QCheckBox* m_continueAfterRefusal = nullptr;
     QCheckBox* m_checkForUpdates = nullptr;
+    QDoubleSpinBox* m_delay = nullptr;
+    QSpinBox* m_hourlyLimit = nullptr;
+    QCheckBox* m_retryTemporary = nullptr;
     QLineEdit* m_password = nullptr;
     QLabel* m_passwordNote = nullptr;
     QLabel* m_defaultClient = nullptr;

@@ -245,13 +245,16 @@ void SMTP::messageNotSent() {
     Q_EMIT refused();
     // RFC 5321 4.2.2: with 421 the server is closing the channel. A kept connection is left
     // no later than the server leaves it, so that the copy can go again over a new one.
-    if (m_keep && reply.startsWith(QLatin1String("421")) && m_session)
-        m_session->close();
+    if (m_keep && reply.startsWith(QLatin1String("421")))
+        closeAfterRefusal();
 }
 
+// RFC 5321 4.1.1.10: QUIT; the session reports connectionTerminated once the server has
+// answered, and the delivery ends as Ended.
 void SMTP::closeAfterRefusal() {
     if (m_state != State::Aborted || !m_session)
         return;
+    // Once only: a second QUIT would end the delivery twice.
     m_state = State::Closing;
     m_session->close();
 }

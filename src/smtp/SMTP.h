@@ -32,7 +32,7 @@ public:
         AwaitingCredentials, ///< the login asked for, not yet answered
         Authenticating,      ///< credentials sent
         Sending,             ///< message handed to the session
-        Closing,             ///< QUIT sent after success or a refused login
+        Closing,             ///< QUIT sent after success, a refused login or a refused message
         Stalled,             ///< an unknown login mechanism: nothing sent, connection open
         Aborted,             ///< the message was refused; the connection is left open
         Halted,              ///< a failure stopped the delivery; the session is closed
@@ -60,6 +60,8 @@ public:
     void setKeepSession(bool keep) { m_keep = keep; }
     /** The session a Kept delivery left open, reparented to nothing; the caller takes it. */
     SmtpSession* takeSession();
+    /** Closes the connection a refused message left open, once; nothing in any other state. */
+    void closeAfterRefusal();
     /** Whether the message went out whole before the delivery ended, so that it may have
      * arrived even though its acceptance was never read. */
     bool messageWritten() const { return m_messageWritten; }
@@ -76,8 +78,6 @@ public:
     const DeliveryRequest& request() const { return m_request; }
     /** The message's Message-ID, once the message is built. */
     const QString& messageId() const { return m_messageId; }
-    /** After refused(): ends the conversation, so that the delivery ends as Ended. */
-    void closeAfterRefusal();
 
 Q_SIGNALS:
     /** A line for the status line and the activity log. */

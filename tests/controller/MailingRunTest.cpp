@@ -9,6 +9,8 @@
 #include "e2e/E2eSupport.h"
 
 #include <QFile>
+#include <QJsonDocument>
+#include <QJsonObject>
 #include <QMetaEnum>
 #include <QStandardPaths>
 #include <QTextDocument>
@@ -66,6 +68,7 @@ public:
     Script script;
     QString summary;
     std::unique_ptr<ServerProcess> pages; // tests/data/pages on 127.0.0.1, see page_server.py
+    std::unique_ptr<ServerProcess> smtp;  // aiosmtpd on 127.0.0.1, see smtp_server.py
     int pagePort = 0;
     QFile log{QStandardPaths::writableLocation(QStandardPaths::GenericDataLocation) +
               QStringLiteral("/Orvale Software/Pelmo/Pelmo.log")};
@@ -127,6 +130,31 @@ const Step stopPageServer = [](Run& run) { run.pages.reset(); };
 const Step showPage = [](Run& run) {
     const QString page = run.controller->messageTemplate().getWebPageOrFileContents();
     run.note("page: " + (page.isNull() ? QStringLiteral("(none)") : page));
+};
+const Step quickBackOffs = [](Run& run) {
+    using namespace std::chrono_literals;
+    run.controller->runPace().setRetrySchedule({10ms, 20ms, 40ms});
+};
+// Real SMTP sessions with aiosmtpd started with arguments, and back-offs of milliseconds.
+Step server(const QStringList& arguments) {
+    return [=](Run& run) {
+        using namespace std::chrono_literals;
+        run.smtp = std::make_unique<ServerProcess>(
+            QStringLiteral(PELMO_TEST_DIR "/smtp/smtp_server.py"), arguments);
+        TestSettings::set("serverAddress", "127.0.0.1");
+        TestSettings::set("serverPort", run.smtp->port());
+        run.controller->setSessionFactory(nullptr);
+        quickBackOffs(run);
+    };
+}
+// Whom the server took each message for, in order.
+const Step received = [](Run& run) {
+    for (const QByteArray& record : run.smtp->records())
+        run.note("received: " + QJsonDocument::fromJson(record)["rcpt_tos"][0].toString());
+};
+const Step untilWaiting = [](Run& run) {
+    ASSERT_TRUE(TestSettings::waitUntil(
+        [&run] { return run.controller->currentRun()->state() == MailingRun::State::Waiting; }));
 };
 const Step pause = [](Run& run) {
     TestSettings::waitUntil([] { return false; }, 300);
@@ -238,6 +266,26 @@ const Scenario kScenarios[] = {
       page("http://127.0.0.1:PORT/dir/tamil.html"), send, showPage,
       page("http://127.0.0.1:PORT/dir"), send, showPage, stopPageServer, send, page("http://"),
       send}},
+    // Between copies the run waits and says for how long; Stop ends the wait at once, and
+    // those not mailed stay pending.
+    {"paced_stop",
+     {setting("delayBetweenMessages", 60), group(kClub + QStringList{"cy@example.org"}), choose,
+      press, untilWaiting, send}},
+    {"pace_bad_delay", {setting("delayBetweenMessages", "soon"), group(kClub), choose, send}},
+    // A copy refused for now goes again after a back-off, and is mailed once.
+    {"temporary_refusal_retried",
+     {setting("retryTemporaryFailures", true), server({"--defer-recipient", "bob@example.org=2"}),
+      group(kClub), choose, send, received}},
+    // A 421 on the kept connection goes again at once over a new one; refused there too, it
+    // waits its first back-off.
+    {"reuse_connection_421_busy",
+     {setting("reuseConnection", true), setting("retryTemporaryFailures", true), quickBackOffs,
+      with<QByteArray>(&Script::refusal, "421 4.7.0 Too busy\r\n"), with(&Script::refuseAtSend, 2),
+      with(&Script::refusals, 2), group(kClub + QStringList{"cy@example.org"}), choose, send}},
+    // After the last retry is refused too, the run stops with the server's reason.
+    {"temporary_refusal_given_up",
+     {setting("retryTemporaryFailures", true), server({"--defer-recipient", "ann@example.org=9"}),
+      group(kClub), choose, send, received}},
     // The address recorded is the one the copy went to, whatever To says by then.
     {"to_edited_while_sending",
      {[](Run& run) { run.script.onSend = [&run] { run.view.toText = "typed@example.org"; }; },

@@ -21,6 +21,7 @@ public:
         std::function<void()> onSend; // runs when the message goes
         int loseAtSend = 0;           // the connection is lost at this send of the run (1-based)
         int refuseAtSend = 0;         // set: the refusal is for this send of the run only
+        int refusals = 1;             // with refuseAtSend: so many sends from it on are refused
         std::shared_ptr<int> sends = std::make_shared<int>(0); // shared by the run's sessions
     };
 
@@ -66,8 +67,10 @@ public:
         const int send = ++*m_script.sends;
         if (m_script.loseConnectionOnSend || send == m_script.loseAtSend)
             return later(&SmtpSession::connectionLost);
-        const bool refused = !m_script.refusal.isEmpty() &&
-                             (m_script.refuseAtSend == 0 || send == m_script.refuseAtSend);
+        const bool refused =
+            !m_script.refusal.isEmpty() &&
+            (m_script.refuseAtSend == 0 ||
+             (send >= m_script.refuseAtSend && send < m_script.refuseAtSend + m_script.refusals));
         m_last = refused ? m_script.refusal : QByteArray("250 OK");
         later(refused ? &SmtpSession::messageNotSent : &SmtpSession::messageSent);
     }

@@ -266,6 +266,9 @@ TEST_F(GuiFixture, PreferencesShowWhatIsStoredAndOkStoresWhatIsEntered) {
         {"completionAction", {}, "Do nothing", "Clear the message", "2"},
         // A stored choice without an item shows blank and is kept as it was.
         {"selectedCharacterSet", "9", "", {}, "9"},
+        {"delayBetweenMessages", "1.5", "1.5", "2.5", "2.5"},
+        {"maxMessagesPerHour", {}, "0", "100", "100"},
+        {"retryTemporaryFailures", {}, "false", "true", "true"},
     };
     for (const auto& field : fields)
         set(field.key, field.before);

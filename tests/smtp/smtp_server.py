@@ -21,10 +21,19 @@ class Handler:
     def __init__(self, args):
         self.user, self.password = args.user.encode(), args.password.encode()
         self.refused_recipients = set(args.refuse_recipient)
+        # ADDRESS=K: the first K tries of that address are answered 451, as a greylisting or
+        # busy server does.
+        self.deferrals = {}
+        for deferral in args.defer_recipient:
+            address, _, times = deferral.rpartition("=")
+            self.deferrals[address] = int(times)
 
     async def handle_RCPT(self, server, session, envelope, address, rcpt_options):
         if address in self.refused_recipients:
             return f"550 5.1.1 <{address}>: Recipient address rejected"
+        if self.deferrals.get(address, 0) > 0:
+            self.deferrals[address] -= 1
+            return f"451 4.7.1 <{address}>: Try again later"
         envelope.rcpt_tos.append(address)
         return "250 2.1.5 OK"
 
@@ -74,6 +83,8 @@ if __name__ == "__main__":
     parser.add_argument("--user", default="user")
     parser.add_argument("--password", default="secret")
     parser.add_argument("--refuse-recipient", action="append", default=[])
+    parser.add_argument("--defer-recipient", action="append", default=[],
+                        help="ADDRESS=K: answer 451 to the first K RCPT TO of ADDRESS")
     parser.add_argument("--size", type=int, default=10 * 1024 * 1024)
     parser.add_argument("--lifetime", type=float, default=60.0)
     parser.add_argument("--data-delay", type=float, default=0.0,
