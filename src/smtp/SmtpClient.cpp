@@ -12,6 +12,10 @@
 #include <QSslSocket>
 #include <QUrl>
 
+#include <netinet/in.h>
+#include <netinet/tcp.h>
+#include <sys/socket.h>
+
 #include <algorithm>
 #include <functional>
 #include <optional>
@@ -397,7 +401,23 @@ void SmtpClient::onEncrypted() {
     } else if (m_state == State::TLSHandshake) {
         sendEhlo();
     }
+    acknowledgePromptly();
     readReplies();
+}
+
+// A TLS 1.3 server sends its session tickets as soon as the handshake ends, and its greeting or
+// EHLO reply right after them. Most servers leave Nagle on, so that reply waits until the
+// tickets are acknowledged, and a delayed ACK (40 ms on Linux) would hold it that long in every
+// session: this side acknowledges at once instead. The kernel drops the option again when it
+// sees a request-reply rhythm, so it is set after this side's last write of the handshake.
+void SmtpClient::acknowledgePromptly() {
+#ifdef TCP_QUICKACK
+    m_socket->flush();
+    const qintptr descriptor = m_socket->socketDescriptor();
+    const int on = 1;
+    if (descriptor >= 0)
+        ::setsockopt(int(descriptor), IPPROTO_TCP, TCP_QUICKACK, &on, sizeof on);
+#endif
 }
 
 void SmtpClient::onSocketError() {

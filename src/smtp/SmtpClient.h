@@ -129,6 +129,7 @@ private:
 
     void onConnected();
     void onEncrypted();
+    void acknowledgePromptly();
     void onSocketError();
     void onDisconnected();
     void onTimeout();
