@@ -67,6 +67,7 @@ bench: deps
 	@echo "== scripts/bench-startup.sh"; bash scripts/bench-startup.sh $(BUILD_BENCH)/src/pelmo
 	@echo "== scripts/bench-relink.sh"; bash scripts/bench-relink.sh $(BUILD_BENCH)/src/pelmo
 	@echo "== scripts/bench-send.sh"; bash scripts/bench-send.sh $(BUILD_BENCH)/src/pelmo
+	@echo "== scripts/bench-tls.sh"; bash scripts/bench-tls.sh $(BUILD_BENCH)/src/pelmo
 
 # Plants each fault of scripts/mutants.list in a copy of the tree under build/mutants, one at a
 # time, and tells how many the tests catch. MUTANTS=3,7,12-20,smtp runs only those.

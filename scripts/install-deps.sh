@@ -12,7 +12,7 @@ packages=(
   libgtest-dev libgmock-dev libbenchmark-dev
   clang libclang-rt-14-dev
   python3-aiosmtpd openssl python3-lxml
-  postfix
+  postfix dovecot-core
   libxcb1-dev xvfb
   xdg-utils desktop-file-utils
   librsvg2-bin appstream dpkg-dev lintian
@@ -39,5 +39,7 @@ if [[ " ${missing[*]} " == *" postfix "* ]]; then
   printf '%s\n' "postfix postfix/main_mailer_type select Local only" \
     "postfix postfix/mailname string localhost" | $sudo debconf-set-selections
 fi
+# Dovecot is here for its SASL authentication service, which the STARTTLS benchmark starts
+# with a configuration of its own; the system-wide one is left as the package installs it.
 $sudo apt-get update -qq
 $sudo apt-get install -y -qq --no-install-recommends "${missing[@]}" >/dev/null

@@ -12,6 +12,10 @@
 #include <QSslSocket>
 #include <QUrl>
 
+#include <netinet/in.h>
+#include <netinet/tcp.h>
+#include <sys/socket.h>
+
 #include <algorithm>
 #include <functional>
 #include <optional>
@@ -136,22 +140,6 @@ QList<QSslCertificate> readCaCertificates(const QString& file, const QString& fo
     return all;
 }
 
-// Reading hundreds of certificate files takes a noticeable while, and a mailing run opens one
-// connection per recipient: the list is read again only when the variables change.
-QList<QSslCertificate> caCertificates(const QString& file, const QString& folders) {
-    static QMutex mutex;
-    static QString cachedFile;
-    static QString cachedFolders;
-    static std::optional<QList<QSslCertificate>> cached;
-    const QMutexLocker lock(&mutex);
-    if (!cached || file != cachedFile || folders != cachedFolders) {
-        cached = readCaCertificates(file, folders);
-        cachedFile = file;
-        cachedFolders = folders;
-    }
-    return *cached;
-}
-
 } // namespace
 
 SmtpClient::SmtpClient(const QString& host, quint16 port, std::chrono::seconds timeout,
@@ -179,15 +167,26 @@ SmtpClient::~SmtpClient() {
     forgetCredentials();
 }
 
+// Reading hundreds of certificate files takes a noticeable while, and a mailing run opens one
+// connection per recipient: the configuration is built again only when the variables change,
+// and every session shares it.
 QSslConfiguration SmtpClient::tlsConfiguration() {
-    QSslConfiguration configuration = QSslConfiguration::defaultConfiguration();
-    // The cached list holds the system's certificates already: asking the configuration for
-    // its own would read the whole system store again for every connection.
-    const QList<QSslCertificate> trusted =
-        caCertificates(qEnvironmentVariable("SSL_CERT_FILE"), qEnvironmentVariable("SSL_CERT_DIR"));
-    if (!trusted.isEmpty())
-        configuration.setCaCertificates(trusted);
-    return configuration;
+    static QMutex mutex;
+    static QString cachedFile;
+    static QString cachedFolders;
+    static std::optional<QSslConfiguration> cached;
+    const QString file = qEnvironmentVariable("SSL_CERT_FILE");
+    const QString folders = qEnvironmentVariable("SSL_CERT_DIR");
+    const QMutexLocker lock(&mutex);
+    if (!cached || file != cachedFile || folders != cachedFolders) {
+        cached = QSslConfiguration::defaultConfiguration();
+        if (const QList<QSslCertificate> trusted = readCaCertificates(file, folders);
+            !trusted.isEmpty())
+            cached->setCaCertificates(trusted);
+        cachedFile = file;
+        cachedFolders = folders;
+    }
+    return *cached;
 }
 
 void SmtpClient::connectInBackgroundAndNotify() {
@@ -397,7 +396,23 @@ void SmtpClient::onEncrypted() {
     } else if (m_state == State::TLSHandshake) {
         sendEhlo();
     }
+    acknowledgePromptly();
     readReplies();
+}
+
+// A TLS 1.3 server sends its session tickets as soon as the handshake ends, and its greeting or
+// EHLO reply right after them. Most servers leave Nagle on, so that reply waits until the
+// tickets are acknowledged, and a delayed ACK (40 ms on Linux) would hold it that long in every
+// session: this side acknowledges at once instead. The kernel drops the option again when it
+// sees a request-reply rhythm, so it is set after this side's last write of the handshake.
+void SmtpClient::acknowledgePromptly() {
+#ifdef TCP_QUICKACK
+    m_socket->flush();
+    const qintptr descriptor = m_socket->socketDescriptor();
+    const int on = 1;
+    if (descriptor >= 0)
+        ::setsockopt(int(descriptor), IPPROTO_TCP, TCP_QUICKACK, &on, sizeof on);
+#endif
 }
 
 void SmtpClient::onSocketError() {

@@ -113,6 +113,7 @@ public:
     /**
      * The TLS settings of every session: the defaults, plus the certificates of
      * SSL_CERT_FILE and of the folders of SSL_CERT_DIR (colon-separated) as trusted CAs.
+     * Built once and shared by every session while those variables stay the same.
      */
     static QSslConfiguration tlsConfiguration();
 
@@ -129,6 +130,7 @@ private:
 
     void onConnected();
     void onEncrypted();
+    void acknowledgePromptly();
     void onSocketError();
     void onDisconnected();
     void onTimeout();
