@@ -1239,6 +1239,122 @@
         <source>mailto: or https: address (optional)</source>
         <translation>mailto:- oder https:-Adresse (freiwillig)</translation>
     </message>
+    <message>
+        <source>Waiting %1 before the next message: %2 of %3 left, about %4 to go.</source>
+        <translation>Warten von %1 bis zur nächsten Nachricht: %2 von %3 übrig, noch etwa %4.</translation>
+    </message>
+    <message>
+        <source>The server refused the message for now: trying again in %1 (retry %2 of %3).</source>
+        <translation>Der Server hat die Nachricht vorerst abgelehnt: neuer Versuch in %1 (Versuch %2 von %3).</translation>
+    </message>
+    <message>
+        <source>The &apos;Delay between messages:&apos; preference value is not a number of seconds from 0 to 86400.</source>
+        <translation>Die Einstellung „Pause zwischen Nachrichten:“ ist keine Zahl von Sekunden zwischen 0 und 86400.</translation>
+    </message>
+    <message>
+        <source>The &apos;At most per hour:&apos; preference value is not a whole number from 0 (no limit) to 100000.</source>
+        <translation>Die Einstellung „Höchstens pro Stunde:“ ist keine ganze Zahl zwischen 0 (keine Grenze) und 100000.</translation>
+    </message>
+    <message>
+        <source>Restored 1 recipient mailed before Pelmo stopped unexpectedly; it is not mailed again.</source>
+        <translation>1 Empfänger wiederhergestellt, der angeschrieben wurde, bevor Pelmo unerwartet beendet wurde; er wird nicht erneut angeschrieben.</translation>
+    </message>
+    <message>
+        <source>Restored %1 recipients mailed before Pelmo stopped unexpectedly; they are not mailed again.</source>
+        <translation>%1 Empfänger wiederhergestellt, die angeschrieben wurden, bevor Pelmo unerwartet beendet wurde; sie werden nicht erneut angeschrieben.</translation>
+    </message>
+    <message>
+        <source>Not delivered %1</source>
+        <translation>Nicht zugestellt %1</translation>
+    </message>
+    <message>
+        <source>Not delivered to %1 &lt;%2&gt;: %3</source>
+        <translation>Nicht zugestellt an %1 &lt;%2&gt;: %3</translation>
+    </message>
+    <message>
+        <source>The group &quot;%1&quot; could not be made: %2</source>
+        <translation>Die Gruppe „%1“ konnte nicht angelegt werden: %2</translation>
+    </message>
+    <message>
+        <source>1 recipient refused is in the group &quot;%1&quot;: send to it to try again.</source>
+        <translation>1 abgelehnter Empfänger ist in der Gruppe „%1“: an sie senden, um es erneut zu versuchen.</translation>
+    </message>
+    <message>
+        <source>%1 recipients refused are in the group &quot;%2&quot;: send to it to try again.</source>
+        <translation>%1 abgelehnte Empfänger sind in der Gruppe „%2“: an sie senden, um es erneut zu versuchen.</translation>
+    </message>
+    <message>
+        <source>%1 s</source>
+        <translation>%1 s</translation>
+    </message>
+    <message>
+        <source>%1 min</source>
+        <translation>%1 min</translation>
+    </message>
+    <message>
+        <source>%1 h</source>
+        <translation>%1 h</translation>
+    </message>
+    <message>
+        <source>%1 h %2 min</source>
+        <translation>%1 h %2 min</translation>
+    </message>
+    <message>
+        <source>The sent ledger cannot be written (%1): mailing goes on, but if Pelmo stops unexpectedly it will not know who was mailed.</source>
+        <translation>Das Versandprotokoll kann nicht geschrieben werden (%1): Der Versand geht weiter, aber wenn Pelmo unerwartet beendet wird, weiß es nicht, wer angeschrieben wurde.</translation>
+    </message>
+    <message>
+        <source>Pelmo stopped unexpectedly during a mailing run.</source>
+        <translation>Pelmo wurde während eines Versands unerwartet beendet.</translation>
+    </message>
+    <message>
+        <source>1 recipient of that run was mailed already.</source>
+        <translation>1 Empfänger dieses Versands wurde bereits angeschrieben.</translation>
+    </message>
+    <message>
+        <source>%1 recipients of that run were mailed already.</source>
+        <translation>%1 Empfänger dieses Versands wurden bereits angeschrieben.</translation>
+    </message>
+    <message>
+        <source>Restore them to the Sent Recipients list, so that Send mails only those not yet mailed?</source>
+        <translation>Sollen sie in die Liste der angeschriebenen Empfänger zurückgeholt werden, damit Senden nur an die noch nicht Angeschriebenen geht?</translation>
+    </message>
+    <message>
+        <source>Restore</source>
+        <translation>Wiederherstellen</translation>
+    </message>
+    <message>
+        <source>Go on when the server refuses a recipient (and group those refused)</source>
+        <translation>Weitermachen, wenn der Server einen Empfänger ablehnt (und die Abgelehnten in einer Gruppe sammeln)</translation>
+    </message>
+    <message>
+        <source>Pace</source>
+        <translation>Tempo</translation>
+    </message>
+    <message>
+        <source> s</source>
+        <translation> s</translation>
+    </message>
+    <message>
+        <source>Delay between messages:</source>
+        <translation>Pause zwischen Nachrichten:</translation>
+    </message>
+    <message>
+        <source>No limit</source>
+        <translation>Keine Grenze</translation>
+    </message>
+    <message>
+        <source>Messages in any hour, for servers that limit it</source>
+        <translation>Nachrichten innerhalb einer Stunde, für Server, die das begrenzen</translation>
+    </message>
+    <message>
+        <source>At most per hour:</source>
+        <translation>Höchstens pro Stunde:</translation>
+    </message>
+    <message>
+        <source>Try again when the server is busy (after 30 s, 2 min, 8 min)</source>
+        <translation>Erneut versuchen, wenn der Server ausgelastet ist (nach 30 s, 2 min, 8 min)</translation>
+    </message>
 </context>
 <context>
     <name>SmtpClient</name>

@@ -1239,6 +1239,122 @@
         <source>mailto: or https: address (optional)</source>
         <translation>adresse mailto: ou https: (facultative)</translation>
     </message>
+    <message>
+        <source>Waiting %1 before the next message: %2 of %3 left, about %4 to go.</source>
+        <translation>Attente de %1 avant le message suivant : %2 sur %3 restants, environ %4 encore.</translation>
+    </message>
+    <message>
+        <source>The server refused the message for now: trying again in %1 (retry %2 of %3).</source>
+        <translation>Le serveur a refusé le message pour l’instant : nouvel essai dans %1 (essai %2 sur %3).</translation>
+    </message>
+    <message>
+        <source>The &apos;Delay between messages:&apos; preference value is not a number of seconds from 0 to 86400.</source>
+        <translation>Le réglage « Pause entre les messages : » n’est pas un nombre de secondes entre 0 et 86400.</translation>
+    </message>
+    <message>
+        <source>The &apos;At most per hour:&apos; preference value is not a whole number from 0 (no limit) to 100000.</source>
+        <translation>Le réglage « Au plus par heure : » n’est pas un nombre entier entre 0 (sans limite) et 100000.</translation>
+    </message>
+    <message>
+        <source>Restored 1 recipient mailed before Pelmo stopped unexpectedly; it is not mailed again.</source>
+        <translation>1 destinataire contacté avant l’arrêt inattendu de Pelmo a été rétabli ; il ne sera pas contacté à nouveau.</translation>
+    </message>
+    <message>
+        <source>Restored %1 recipients mailed before Pelmo stopped unexpectedly; they are not mailed again.</source>
+        <translation>%1 destinataires contactés avant l’arrêt inattendu de Pelmo ont été rétablis ; ils ne seront pas contactés à nouveau.</translation>
+    </message>
+    <message>
+        <source>Not delivered %1</source>
+        <translation>Non distribués %1</translation>
+    </message>
+    <message>
+        <source>Not delivered to %1 &lt;%2&gt;: %3</source>
+        <translation>Non distribué à %1 &lt;%2&gt; : %3</translation>
+    </message>
+    <message>
+        <source>The group &quot;%1&quot; could not be made: %2</source>
+        <translation>Le groupe « %1 » n’a pas pu être créé : %2</translation>
+    </message>
+    <message>
+        <source>1 recipient refused is in the group &quot;%1&quot;: send to it to try again.</source>
+        <translation>1 destinataire refusé est dans le groupe « %1 » : envoyez-lui le message pour réessayer.</translation>
+    </message>
+    <message>
+        <source>%1 recipients refused are in the group &quot;%2&quot;: send to it to try again.</source>
+        <translation>%1 destinataires refusés sont dans le groupe « %2 » : envoyez-leur le message pour réessayer.</translation>
+    </message>
+    <message>
+        <source>%1 s</source>
+        <translation>%1 s</translation>
+    </message>
+    <message>
+        <source>%1 min</source>
+        <translation>%1 min</translation>
+    </message>
+    <message>
+        <source>%1 h</source>
+        <translation>%1 h</translation>
+    </message>
+    <message>
+        <source>%1 h %2 min</source>
+        <translation>%1 h %2 min</translation>
+    </message>
+    <message>
+        <source>The sent ledger cannot be written (%1): mailing goes on, but if Pelmo stops unexpectedly it will not know who was mailed.</source>
+        <translation>Le journal des envois ne peut pas être écrit (%1) : l’envoi continue, mais si Pelmo s’arrête de façon inattendue, il ne saura pas qui a été contacté.</translation>
+    </message>
+    <message>
+        <source>Pelmo stopped unexpectedly during a mailing run.</source>
+        <translation>Pelmo s’est arrêté de façon inattendue pendant un envoi.</translation>
+    </message>
+    <message>
+        <source>1 recipient of that run was mailed already.</source>
+        <translation>1 destinataire de cet envoi avait déjà été contacté.</translation>
+    </message>
+    <message>
+        <source>%1 recipients of that run were mailed already.</source>
+        <translation>%1 destinataires de cet envoi avaient déjà été contactés.</translation>
+    </message>
+    <message>
+        <source>Restore them to the Sent Recipients list, so that Send mails only those not yet mailed?</source>
+        <translation>Les remettre dans la liste des destinataires contactés, pour qu’Envoyer n’écrive qu’à ceux qui ne l’ont pas encore été ?</translation>
+    </message>
+    <message>
+        <source>Restore</source>
+        <translation>Rétablir</translation>
+    </message>
+    <message>
+        <source>Go on when the server refuses a recipient (and group those refused)</source>
+        <translation>Continuer quand le serveur refuse un destinataire (et regrouper les refusés)</translation>
+    </message>
+    <message>
+        <source>Pace</source>
+        <translation>Rythme</translation>
+    </message>
+    <message>
+        <source> s</source>
+        <translation> s</translation>
+    </message>
+    <message>
+        <source>Delay between messages:</source>
+        <translation>Pause entre les messages :</translation>
+    </message>
+    <message>
+        <source>No limit</source>
+        <translation>Sans limite</translation>
+    </message>
+    <message>
+        <source>Messages in any hour, for servers that limit it</source>
+        <translation>Messages sur une heure quelconque, pour les serveurs qui les limitent</translation>
+    </message>
+    <message>
+        <source>At most per hour:</source>
+        <translation>Au plus par heure :</translation>
+    </message>
+    <message>
+        <source>Try again when the server is busy (after 30 s, 2 min, 8 min)</source>
+        <translation>Réessayer quand le serveur est occupé (après 30 s, 2 min, 8 min)</translation>
+    </message>
 </context>
 <context>
     <name>SmtpClient</name>
