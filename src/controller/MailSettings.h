@@ -41,6 +41,7 @@ public:
         ReuseConnection,
         AddPlainTextAlternative,
         ListUnsubscribe,
+        ServerSizeLimits,
     };
 
     /** The store of the current user; makes its folder and file private. */
@@ -72,6 +73,10 @@ public:
     /** The server port, 1 to 65365 inclusive; throws BadPort otherwise (missing is 0). */
     int port();
     bool isOverridden(Key key) const;
+    /** The largest message host:port announced (SIZE) on its last connection; 0 unknown. */
+    qint64 sizeLimit(const QString& host, int port);
+    /** Remembers what host:port announced; a limit of 0 or less forgets it. */
+    void rememberSizeLimit(const QString& host, int port, qint64 limit);
 
     /** Stores value (an empty string removes the key) and writes the file at once. */
     void setValue(Key key, const QVariant& value);
