@@ -103,9 +103,10 @@ TEST_P(Preflight, Findings) {
 INSTANTIATE_TEST_SUITE_P(Rows, Preflight, ::testing::ValuesIn(kCases), RowName());
 
 // A test copy goes to aiosmtpd as a run's copy would, for the member chosen, to the sender;
-// the sent list, the not-mailed list and the members still to be mailed are left alone.
+// the server's SIZE is remembered, and the sent list, the not-mailed list and the members still to
+// be mailed are left alone.
 TEST_F(ControllerFixture, TestCopyGoesToTheSenderAndMailsNobody) {
-    ServerProcess server(PELMO_TEST_DIR "/smtp/smtp_server.py", {});
+    ServerProcess server(PELMO_TEST_DIR "/smtp/smtp_server.py", {"--size", "2000000"});
     for (auto [key, value] : QVariantMap{
              {"senderEmail", "club@example.org"},
              {"senderName", "The Club"},
@@ -130,6 +131,8 @@ TEST_F(ControllerFixture, TestCopyGoesToTheSenderAndMailsNobody) {
     const ReceivedMessage copy = parseMessage(messageOf(server.records().value(0)));
     EXPECT_EQ(copy.to + " / " + copy.subject + " / " + copy.parts.value(0).content,
               "The Club <club@example.org> / [Test] News / Dear Bob Test");
+    // aiosmtpd's SIZE, kept for the check before the next group run.
+    EXPECT_EQ(mailSettings.sizeLimit("127.0.0.1", server.port()), 2000000);
     EXPECT_EQ(controller->sentRecipients().rowCount(), 0);
     EXPECT_EQ(controller->notMailedRecipients().rowCount(), 0);
     EXPECT_EQ(controller->copyChoices(),
