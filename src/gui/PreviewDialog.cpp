@@ -26,7 +26,8 @@ public:
     QVariant loadResource(int, const QUrl&) override { return {}; }
 };
 
-// The header lines of message, continuation lines joined, without those shown decoded above.
+// The header lines of message, named as they are on the wire, continuation lines joined, without
+// those shown decoded above.
 QString otherHeaders(const QByteArray& message) {
     const QByteArray head = message.left(message.indexOf("\r\n\r\n"));
     QStringList lines;
@@ -114,7 +115,7 @@ void PreviewDialog::copyReady() {
         return;
     }
     const DeliveryRequest& copy = preview->request();
-    m_headers->setPlainText(LocalizedStringNS("From: %1\nTo: %2\nSubject: %3\n")
+    m_headers->setPlainText(QStringLiteral("From: %1\nTo: %2\nSubject: %3\n")
                                 .arg(mailbox(copy.senderName, copy.sender),
                                      mailbox(copy.recipientName, copy.recipient), copy.subject) +
                             otherHeaders(preview->bytes()));
