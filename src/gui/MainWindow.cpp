@@ -308,6 +308,9 @@ void MainWindow::closeEvent(QCloseEvent* event) {
 void MainWindow::checkThenSend() {
     if (m_preflight) // a second press while the first is being checked
         return;
+    // The message may have been mended since: the findings shown are checked again.
+    if (m_preflightDialog)
+        m_preflightDialog->close();
     m_preflight = m_controller->checkBeforeSend(this);
     connect(m_preflight, &PreflightCheck::finished, this, [this] {
         PreflightCheck* check = m_preflight;
@@ -318,9 +321,10 @@ void MainWindow::checkThenSend() {
         QStringList texts;
         for (const PreflightCheck::Finding& finding : check->findings())
             texts << finding.text;
-        auto* dialog = new PreflightDialog(texts, this);
-        connect(dialog, &QDialog::accepted, m_controller, &PelmoController::send);
-        dialog->open();
+        m_preflightDialog = new PreflightDialog(texts, this);
+        connect(m_preflightDialog, &QDialog::accepted, m_controller, &PelmoController::send);
+        // Not modal: the user may look at the message, or mend it, while the list is shown.
+        m_preflightDialog->show();
     });
 }
 

@@ -15,6 +15,7 @@ class PeoplePicker;
 class PreferencesDialog;
 class PreflightCheck;
 class PreviewDialog;
+class QDialog;
 class QLabel;
 class QLineEdit;
 class QProgressBar;
@@ -138,6 +139,8 @@ private:
     PreviewDialog* m_preview = nullptr;
     /** The check before a group's run, while it is under way. */
     QPointer<PreflightCheck> m_preflight;
+    /** Its findings, while shown; a new press of Send checks again. */
+    QPointer<QDialog> m_preflightDialog;
     AttachmentsWindow* m_attachmentsWindow = nullptr;
     SoftwareUpdateWindow* m_softwareUpdateWindow = nullptr;
     LogWindow* m_logWindow = nullptr;

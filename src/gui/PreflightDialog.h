@@ -5,8 +5,8 @@
 
 /**
  * The findings of the check before a group run, listed, with Send Anyway (accepted()) and
- * Cancel (rejected()). Window-modal without a nested event loop: open() it and act on the
- * signals.
+ * Cancel (rejected()). Shown without a nested event loop: show() it and act on the signals.
+ * It deletes itself when closed.
  */
 class PreflightDialog : public QDialog {
     Q_OBJECT
