@@ -3,9 +3,11 @@
 #include "addressbook/AddressBook.h"
 #include "app/ConsoleView.h"
 #include "attachments/AttachmentsController.h"
+#include "controller/CopyPreview.h"
 #include "controller/MailSettings.h"
 #include "controller/PasswordStore.h"
 #include "controller/PelmoController.h"
+#include "controller/PreflightCheck.h"
 #include "smtp/DryRunSession.h"
 #include "util/PelmoException.h"
 
@@ -26,11 +28,13 @@ constexpr char kUsage[] =
     "usage: pelmo send [--group NAME | --to ADDRESS [--name NAME]] [--subject TEXT]\n"
     "                  [--message FILE] [--page URL | --front-page] [--attach FILE]...\n"
     "                  [--delay SECONDS] [--max-per-hour N] [--set KEY=VALUE]...\n"
-    "                  [--dry-run DIR] [--resume]\n";
+    "                  [--dry-run DIR | --preview N | --test N] [--strict] [--resume]\n";
 
 struct SendOptions {
     QString group, to, name, subject, messageFile, page, dryRunDirectory;
-    bool hasTo = false, hasName = false, frontPage = false, resume = false;
+    bool hasTo = false, hasName = false, frontPage = false, resume = false, strict = false;
+    /** The copy to print (--preview) or to mail to the sender (--test); 0 for none. */
+    int preview = 0, test = 0;
     QStringList attachments;
     QList<QPair<QString, QString>> settings;
 };
@@ -45,6 +49,15 @@ QString valueAfter(const QStringList& args, qsizetype& i) {
     if (i + 1 >= args.size())
         throw UsageError(QStringLiteral("%1 needs a value").arg(args.at(i)));
     return args.at(++i);
+}
+
+int copyNumber(const QStringList& args, qsizetype& i) {
+    const QString& option = args.at(i);
+    bool number = false;
+    const int copy = valueAfter(args, i).toInt(&number);
+    if (!number || copy < 1)
+        throw UsageError(QStringLiteral("%1 takes a copy number from 1").arg(option));
+    return copy;
 }
 
 SendOptions parse(const QStringList& args) {
@@ -89,6 +102,12 @@ SendOptions parse(const QStringList& args) {
                 throw UsageError(QStringLiteral("--max-per-hour takes a whole number from 1 to %1")
                                      .arg(MailSettings::kMaxMessagesPerHour));
             options.settings.append({MailSettings::name(Key::MaxMessagesPerHour), copies});
+        } else if (option == QLatin1String("--preview")) {
+            options.preview = copyNumber(args, i);
+        } else if (option == QLatin1String("--test")) {
+            options.test = copyNumber(args, i);
+        } else if (option == QLatin1String("--strict")) {
+            options.strict = true;
         } else if (option == QLatin1String("--set")) {
             const QString pair = valueAfter(args, i);
             const qsizetype equals = pair.indexOf(QLatin1Char('='));
@@ -106,6 +125,8 @@ SendOptions parse(const QStringList& args) {
         throw UsageError(QStringLiteral("--group and --to/--name cannot be used together"));
     if (options.frontPage && !options.page.isEmpty())
         throw UsageError(QStringLiteral("--page and --front-page cannot be used together"));
+    if ((options.preview > 0) + (options.test > 0) + !options.dryRunDirectory.isEmpty() > 1)
+        throw UsageError(QStringLiteral("--dry-run, --preview and --test cannot be used together"));
     return options;
 }
 
@@ -150,6 +171,12 @@ bool prepare(PelmoController& controller, AddressBook& book, const SendOptions& 
     PelmoView& view = controller.view();
     for (const auto& [key, value] : options.settings)
         controller.settings().overrideValue(*MailSettings::keyNamed(key), value);
+    // A preview prints the message alone: the fields start as start-up would leave them,
+    // without its "Ready.".
+    if (options.preview > 0) {
+        view.setTo(controller.getDefaultTo());
+        view.setName(controller.getDefaultToName());
+    }
     if (options.hasTo)
         view.setTo(options.to);
     if (options.hasName)
@@ -187,6 +214,52 @@ bool prepare(PelmoController& controller, AddressBook& book, const SendOptions& 
     return true;
 }
 
+// Runs the main loop until signal of sender comes.
+template <class Sender, class Signal>
+void waitFor(Sender* sender, Signal signal) {
+    QObject::connect(sender, signal, [] { QCoreApplication::exit(0); });
+    QCoreApplication::exec();
+}
+
+// Copy number copy on standard output, as it will be sent; 0 when it could be made.
+int printCopy(PelmoController& controller, int copy) {
+    CopyPreview* preview = controller.previewCopy(copy, &controller);
+    waitFor(preview, &CopyPreview::finished);
+    if (!preview->pageAddress().isEmpty())
+        QTextStream(stderr) << "pelmo send: warning: could not download " << preview->pageAddress()
+                            << ": " << preview->pageError() << '\n';
+    if (preview->state() != CopyPreview::State::Ready) {
+        QTextStream(stderr) << "pelmo send: " << preview->failure() << '\n';
+        return 1;
+    }
+    QFile out;
+    return out.open(stdout, QIODevice::WriteOnly) && out.write(preview->bytes()) ? 0 : 1;
+}
+
+// 0 when the server accepted the test copy.
+int mailTest(PelmoController& controller, int copy) {
+    bool accepted = false;
+    QObject::connect(&controller, &PelmoController::testSettled,
+                     [&accepted](bool answer) { accepted = answer; });
+    QMetaObject::invokeMethod(
+        &controller, [&controller, copy] { controller.sendTest(copy); }, Qt::QueuedConnection);
+    waitFor(&controller, &PelmoController::testSettled);
+    return accepted ? 0 : 1;
+}
+
+// Before a group run, what is worth a second look goes to standard error; with strict it
+// stops the run before anyone is mailed. True when the run may go.
+bool checkBeforeSend(PelmoController& controller, bool strict) {
+    if (!controller.getPeople())
+        return true;
+    PreflightCheck* check = controller.checkBeforeSend(&controller);
+    waitFor(check, &PreflightCheck::finished);
+    for (const PreflightCheck::Finding& finding : check->findings())
+        QTextStream(stderr) << "pelmo send: " << (strict ? "error: " : "warning: ") << finding.text
+                            << '\n';
+    return !strict || check->findings().isEmpty();
+}
+
 // 0 when the run completed with every copy accepted.
 int runMailing(PelmoController& controller) {
     QObject::connect(&controller, &PelmoController::runSettled, [] { QCoreApplication::exit(0); });
@@ -214,9 +287,16 @@ int send(const QStringList& args) {
         QTextStream(stderr) << "pelmo send: " << problem << '\n';
         return 1;
     }
-    return onConsole("send", true, [&options](PelmoController& controller, AddressBook& book) {
-        return prepare(controller, book, options) ? runMailing(controller) : 1;
-    });
+    return onConsole(
+        "send", options.preview == 0, [&options](PelmoController& controller, AddressBook& book) {
+            if (!prepare(controller, book, options))
+                return 1;
+            if (options.preview > 0)
+                return printCopy(controller, options.preview);
+            if (options.test > 0)
+                return mailTest(controller, options.test);
+            return checkBeforeSend(controller, options.strict) ? runMailing(controller) : 1;
+        });
 }
 
 int onConsole(const char* command, bool startUp,

@@ -7,6 +7,7 @@
 
 #include <QFileInfo>
 
+#include <algorithm>
 #include <iterator>
 
 namespace {
@@ -82,6 +83,8 @@ const Row kTable[] = {
                   "limit) to 100000.")},
     // A copy refused for now (421, 450, 451, 452) goes again after a back-off.
     {Key::RetryTemporaryFailures, "retryTemporaryFailures", false, nullptr, nullptr},
+    // What each server announced as its SIZE: "host:port=bytes" entries, blank-separated.
+    {Key::ServerSizeLimits, "serverSizeLimits", QVariant(), nullptr, nullptr},
 };
 
 const Row& rowOf(Key key) {
@@ -101,7 +104,7 @@ std::filesystem::path pathOf(const QString& name) {
 
 MailSettings::MailSettings()
     : store(QString::fromLatin1(kOrganisationName), QString::fromLatin1(kApplicationName)) {
-    static_assert(std::size(kTable) == static_cast<size_t>(Key::RetryTemporaryFailures) + 1);
+    static_assert(std::size(kTable) == static_cast<size_t>(Key::ServerSizeLimits) + 1);
     // The file may hold the password when no keyring answers: made private before anything is
     // written to it, and tightened when an older Pelmo left it readable.
     const QFileInfo file(store.fileName());
@@ -201,6 +204,32 @@ int MailSettings::maxMessagesPerHour() {
 
 bool MailSettings::isOverridden(Key key) const {
     return overrides.contains(name(key));
+}
+
+namespace {
+
+QString serverEntry(const QString& host, int port) {
+    return host.toLower() + QLatin1Char(':') + QString::number(port) + QLatin1Char('=');
+}
+
+} // namespace
+
+qint64 MailSettings::sizeLimit(const QString& host, int port) {
+    const QString server = serverEntry(host, port);
+    for (const QString& entry : string(Key::ServerSizeLimits).split(QLatin1Char(' ')))
+        if (entry.startsWith(server))
+            return std::max<qint64>(0, entry.mid(server.size()).toLongLong());
+    return 0;
+}
+
+void MailSettings::rememberSizeLimit(const QString& host, int port, qint64 limit) {
+    const QString server = serverEntry(host, port);
+    QStringList entries = string(Key::ServerSizeLimits).split(QLatin1Char(' '), Qt::SkipEmptyParts);
+    entries.removeIf([&server](const QString& entry) { return entry.startsWith(server); });
+    if (limit > 0)
+        entries << server + QString::number(limit);
+    if (entries.join(QLatin1Char(' ')) != string(Key::ServerSizeLimits))
+        setValue(Key::ServerSizeLimits, entries.join(QLatin1Char(' ')));
 }
 
 void MailSettings::setValue(Key key, const QVariant& newValue) {

@@ -45,6 +45,7 @@ public:
         DelayBetweenMessages,
         MaxMessagesPerHour,
         RetryTemporaryFailures,
+        ServerSizeLimits,
     };
 
     /** The bounds of the pace settings, for the forms and the command line that set them. */
@@ -86,6 +87,10 @@ public:
      *  number from 0 to kMaxMessagesPerHour. */
     int maxMessagesPerHour();
     bool isOverridden(Key key) const;
+    /** The largest message host:port announced (SIZE) on its last connection; 0 unknown. */
+    qint64 sizeLimit(const QString& host, int port);
+    /** Remembers what host:port announced; a limit of 0 or less forgets it. */
+    void rememberSizeLimit(const QString& host, int port, qint64 limit);
 
     /** Stores value (an empty string removes the key) and writes the file at once. */
     void setValue(Key key, const QVariant& value);

@@ -74,17 +74,20 @@ void MailingRun::start() {
                     status(LocalizedStringNS("Could not download \"%1\"").arg(address));
                     return pageReady(QString());
                 }
-                const QByteArray bytes = page.toUtf8();
-                CText text("");
-                text.append(bytes.constData(), bytes.size());
                 status(LocalizedStringNS("Relinking web page..."));
-                // Reading the MIME database takes a tenth of a second: only runs with a page
-                // pay for it.
-                EnsureSuffixMap();
-                relink(CString256(m_typedAddress.toUtf8().constData()), text);
-                pageReady(QString::fromUtf8(text.buffer(), text.length()));
+                pageReady(relinkedPage(page, m_typedAddress));
             });
     m_download->start(address);
+}
+
+QString MailingRun::relinkedPage(const QString& page, const QString& typedAddress) {
+    const QByteArray bytes = page.toUtf8();
+    CText text("");
+    text.append(bytes.constData(), bytes.size());
+    // Reading the MIME database takes a tenth of a second: only runs with a page pay for it.
+    EnsureSuffixMap();
+    relink(CString256(typedAddress.toUtf8().constData()), text);
+    return QString::fromUtf8(text.buffer(), text.length());
 }
 
 void MailingRun::pageReady(const QString& page) {
@@ -318,19 +321,29 @@ void MailingRun::closeOpenSession() {
     session->close();
 }
 
+DeliveryRequest MailingRun::buildRequest() {
+    DeliveryRequest request = requestFor(
+        m_parts.message, m_parts.settings, m_parts.attachments, [this](const DeliveryRequest& to) {
+            status(QLatin1Char('[') + now() + QLatin1Char(']') + LocalizedStringNS(" Mail to: ") +
+                   to.recipientName + QLatin1String(" <") + to.recipient + QLatin1Char('>'));
+        });
+    request.credentials = credentialsFrom(m_parts.settings, m_parts.passwords, this);
+    return request;
+}
+
 // The settings and texts are read in the order a message is built, so that the first missing
 // one is the one reported.
-DeliveryRequest MailingRun::buildRequest() {
-    MessageTemplate& message = m_parts.message;
-    MailSettings& settings = m_parts.settings;
+DeliveryRequest MailingRun::requestFor(MessageTemplate& message, MailSettings& settings,
+                                       const AttachmentsController& attachments,
+                                       const std::function<void(const DeliveryRequest&)>& addressed,
+                                       bool serverNeeded) {
     DeliveryRequest request;
     request.subject = message.getSubject();
     request.senderName = message.getFromName();
     request.sender = message.getFrom();
     request.recipientName = message.getToName();
     request.recipient = message.getTo();
-    status(QLatin1Char('[') + now() + QLatin1Char(']') + LocalizedStringNS(" Mail to: ") +
-           request.recipientName + QLatin1String(" <") + request.recipient + QLatin1Char('>'));
+    addressed(request);
     request.characterSet = settings.integer(Key::SelectedCharacterSet);
     switch (settings.integer(Key::SelectedContentType)) {
     case 0:
@@ -346,49 +359,49 @@ DeliveryRequest MailingRun::buildRequest() {
     }
     if (const QString page = message.getWebPageOrFileContents(); !page.isNull())
         request.bodyParts.append({page, QStringLiteral("text/html")});
-    request.attachments = m_parts.attachments.getAttachments();
+    request.attachments = attachments.getAttachments();
     request.listUnsubscribe = settings.string(Key::ListUnsubscribe);
-    request.server = settings.required(Key::ServerAddress);
-    request.port = settings.port();
+    request.server =
+        serverNeeded ? settings.required(Key::ServerAddress) : settings.string(Key::ServerAddress);
+    request.port = serverNeeded ? settings.port() : settings.integer(Key::ServerPort);
     request.useSSL = settings.boolean(Key::UseSSL);
     request.loginMechanism = settings.integer(Key::SelectedAuthentication);
-    request.credentials = [this](std::function<void(const Credentials&)> answer) {
-        askCredentials(answer);
-    };
     return request;
 }
 
 // The user name, then the password: a password given for this run, else the keyring's, else
 // the settings key's.
-void MailingRun::askCredentials(const std::function<void(const Credentials&)>& answer) {
-    MailSettings& settings = m_parts.settings;
-    Credentials credentials;
-    const auto passwordFromSettings = [&settings](Credentials& login) {
+DeliveryRequest::CredentialsRequest
+MailingRun::credentialsFrom(MailSettings& settings, PasswordStore& passwords, QObject* context) {
+    return [&settings, &passwords, context](std::function<void(const Credentials&)> answer) {
+        Credentials credentials;
+        const auto passwordFromSettings = [&settings](Credentials& login) {
+            try {
+                login.password = settings.required(Key::LoginPassword);
+            } catch (const PelmoException& failure) {
+                login.failure = failure;
+            }
+        };
         try {
-            login.password = settings.required(Key::LoginPassword);
+            credentials.user = settings.required(Key::LoginUsername);
         } catch (const PelmoException& failure) {
-            login.failure = failure;
+            credentials.failure = failure;
+            return answer(credentials);
         }
+        if (settings.isOverridden(Key::LoginPassword)) {
+            passwordFromSettings(credentials);
+            return answer(credentials);
+        }
+        passwords.readPassword(
+            MailSettings::name(Key::LoginPassword), context,
+            [credentials, answer, passwordFromSettings](const QString& fromKeyring) mutable {
+                if (fromKeyring.isEmpty())
+                    passwordFromSettings(credentials);
+                else
+                    credentials.password = fromKeyring;
+                answer(credentials);
+            });
     };
-    try {
-        credentials.user = settings.required(Key::LoginUsername);
-    } catch (const PelmoException& failure) {
-        credentials.failure = failure;
-        return answer(credentials);
-    }
-    if (settings.isOverridden(Key::LoginPassword)) {
-        passwordFromSettings(credentials);
-        return answer(credentials);
-    }
-    m_parts.passwords.readPassword(
-        MailSettings::name(Key::LoginPassword), this,
-        [credentials, answer, passwordFromSettings](const QString& fromKeyring) mutable {
-            if (fromKeyring.isEmpty())
-                passwordFromSettings(credentials);
-            else
-                credentials.password = fromKeyring;
-            answer(credentials);
-        });
 }
 
 void MailingRun::deliveryFinished(SMTP* delivery) {

@@ -87,6 +87,22 @@ public:
     /** Stops the run after the delivery in progress, or at once while the page downloads. */
     void abort();
 
+    /**
+     * The request for the copy that message makes now, without credentials: the same for a
+     * run's copy, a preview and a test copy. addressed is told the recipient as soon as it is
+     * known, before a later setting can fail. Throws PelmoException for a missing value; the
+     * server's address and port only when needed (a preview does without them).
+     */
+    static DeliveryRequest requestFor(MessageTemplate& message, MailSettings& settings,
+                                      const AttachmentsController& attachments,
+                                      const std::function<void(const DeliveryRequest&)>& addressed,
+                                      bool serverNeeded = true);
+    /** The login as a run asks for it; answers on context's thread. */
+    static DeliveryRequest::CredentialsRequest
+    credentialsFrom(MailSettings& settings, PasswordStore& passwords, QObject* context);
+    /** page, downloaded from typedAddress, with its links made absolute against it. */
+    static QString relinkedPage(const QString& page, const QString& typedAddress);
+
     State state() const { return m_state; }
     /** Whether a delivery of this run has not ended yet. */
     bool isDelivering() const { return !m_delivery.isNull(); }
@@ -122,7 +138,6 @@ private:
     bool retryLater(SMTP* delivery);
     void deliver();
     DeliveryRequest buildRequest();
-    void askCredentials(const std::function<void(const Credentials&)>& answer);
     void deliveryFinished(SMTP* delivery);
     void endRun();
     void finishRun(bool succeeded);

@@ -100,13 +100,17 @@ void MessageTemplate::clearBody() {
     cursor.removeSelectedText();
 }
 
+void MessageTemplate::setRecipient(const QString& name, const QString& address) {
+    recipient = std::make_pair(name, address);
+}
+
 QString MessageTemplate::getTo() {
-    return requiredField(view.to(), "NoRecipientsEmail",
+    return requiredField(recipient ? recipient->second : view.to(), "NoRecipientsEmail",
                          LocalizedKey("The 'Recipient Address:' value has not been specified."));
 }
 
 QString MessageTemplate::getToName() {
-    return requiredField(view.name(), "NoRecipientsName",
+    return requiredField(recipient ? recipient->first : view.name(), "NoRecipientsName",
                          LocalizedKey("The 'Recipients Name:' value has not been specified."));
 }
 

@@ -4,6 +4,7 @@
 #include <QString>
 
 #include <optional>
+#include <utility>
 
 class MailSettings;
 class PelmoView;
@@ -51,6 +52,15 @@ public:
      */
     QString replaceTags(const QString& text);
 
+    /**
+     * Makes getTo() and getToName() answer address and name instead of the fields, so that a
+     * member's copy can be made without touching the window; clearRecipient() ends it.
+     */
+    void setRecipient(const QString& name, const QString& address);
+    void clearRecipient() { recipient.reset(); }
+
+    /** This run's page as downloaded and relinked, its tags not replaced; null for none. */
+    const QString& page() const { return webPageOrFileContents; }
     /** Keeps page as this run's downloaded and relinked page; null for none. */
     void setPage(const QString& page) { webPageOrFileContents = page; }
     /** This run's page with the tags replaced for the current recipient; null without a page. */
@@ -67,4 +77,6 @@ private:
     std::optional<QString> htmlBody;
     int htmlCharset = -1;
     QString webPageOrFileContents;
+    /** The name and address a copy is made for, when not the fields'. */
+    std::optional<std::pair<QString, QString>> recipient;
 };

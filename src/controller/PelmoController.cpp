@@ -2,11 +2,14 @@
 
 #include "addressbook/AddressBook.h"
 #include "attachments/AttachmentsController.h"
+#include "controller/CopyPreview.h"
 #include "controller/MailSettings.h"
 #include "controller/MessageTemplate.h"
 #include "controller/NotMailedRecipients.h"
+#include "controller/PreflightCheck.h"
 #include "controller/RecipientSelection.h"
 #include "controller/SentRecipients.h"
+#include "smtp/SMTP.h"
 #include "smtp/SmtpClient.h"
 #include "util/CLog.h"
 #include "util/DataFolder.h"
@@ -148,6 +151,60 @@ void PelmoController::send() {
     started->start();
 }
 
+CopyPreview* PelmoController::previewCopy(int copy, QObject* owner) {
+    auto* preview =
+        new CopyPreview({window, defaults, *content, *recipientSelection, *attachments}, owner);
+    preview->start(copy);
+    return preview;
+}
+
+QStringList PelmoController::copyChoices() const {
+    return CopyPreview::choices(window, *recipientSelection);
+}
+
+PreflightCheck* PelmoController::checkBeforeSend(QObject* owner) {
+    auto* check =
+        new PreflightCheck({window, defaults, *content, *recipientSelection, *attachments}, owner);
+    check->start();
+    return check;
+}
+
+void PelmoController::sendTest(int copy) {
+    CopyPreview* preview = previewCopy(copy, this);
+    connect(preview, &CopyPreview::finished, this, [this, preview] {
+        preview->deleteLater();
+        if (preview->state() != CopyPreview::State::Ready) {
+            statusMsg(preview->failure());
+            return Q_EMIT testSettled(false);
+        }
+        DeliveryRequest request = preview->request();
+        try {
+            request.server = getServer();
+            request.port = getPort();
+        } catch (const PelmoException& failure) {
+            statusMsg(LocalizedFormat("Error (%@): %@", {failure.name(), failure.reason()}));
+            return Q_EMIT testSettled(false);
+        }
+        statusMsg(LocalizedStringNS("Test copy for %1 <%2>, to %3.")
+                      .arg(request.recipientName, request.recipient, request.sender));
+        request.recipientName = request.senderName;
+        request.recipient = request.sender;
+        request.subject = QStringLiteral("[Test] ") + request.subject;
+        request.credentials = MailingRun::credentialsFrom(defaults, passwords, this);
+        // Its acceptance is not connected to the sent list: the member is still to be mailed.
+        auto* delivery = new SMTP(request, createSession(request.server, request.port), this);
+        connect(delivery, &SMTP::statusMessage, this, &PelmoController::statusMsg);
+        // A refusal or an unknown login mechanism leaves the connection open: it is closed here.
+        for (auto signal : {&SMTP::refused, &SMTP::stalled, &SMTP::finished})
+            connect(delivery, signal, this, [this, delivery] {
+                disconnect(delivery, nullptr, this, nullptr);
+                delivery->deleteLater();
+                Q_EMIT testSettled(delivery->succeeded());
+            });
+        delivery->start();
+    });
+}
+
 void PelmoController::abort() {
     if (run)
         run->abort();
@@ -199,6 +256,10 @@ SmtpSession* PelmoController::createSession(const QString& host, int port) {
     // elsewhere.
     if (defaults.boolean(Key::ImplicitTLS))
         client->setImplicitTLS(true);
+    // What the server announces as its SIZE is kept for the check before the next group run.
+    connect(client, &SmtpSession::serviceInitialized, this, [this, client, host, port] {
+        defaults.rememberSizeLimit(host, port, client->sizeLimit());
+    });
     return client;
 }
 

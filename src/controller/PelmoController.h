@@ -17,6 +17,8 @@
 
 class AddressBook;
 class AttachmentsController;
+class CopyPreview;
+class PreflightCheck;
 class MailSettings;
 class MessageTemplate;
 class NotMailedRecipients;
@@ -90,6 +92,21 @@ public:
     void send();
     /** Stops the run after the delivery in progress; the persons not yet mailed stay pending. */
     void abort();
+    /**
+     * Copy number copy (from 1) of the pending group, or the To field's copy, made as it will
+     * be sent; started, owned by owner. See CopyPreview.
+     */
+    CopyPreview* previewCopy(int copy, QObject* owner);
+    /** "Name <address>" of each copy the next Send makes, for choosing one to preview. */
+    QStringList copyChoices() const;
+    /** The check before a group run, started, owned by owner. See PreflightCheck. */
+    PreflightCheck* checkBeforeSend(QObject* owner);
+    /**
+     * Mails copy number copy, made for its member, to the sender's own address with "[Test] "
+     * before the subject, through the same delivery as a run's copy. The sent list, the
+     * not-mailed list and the pending members stay as they are. testSettled() follows.
+     */
+    void sendTest(int copy);
     /** The run of the latest press of Send, null before the first. */
     MailingRun* currentRun() const { return run; }
     /** Replaces how sessions are made (a dry run writes files; tests hand in their own). */
@@ -182,6 +199,8 @@ public Q_SLOTS:
 Q_SIGNALS:
     /** The latest run has nothing under way any more: it is over, stopped, stalled or halted. */
     void runSettled();
+    /** The test copy was accepted, or not (refused, no connection, no such copy). */
+    void testSettled(bool accepted);
     /** The Web Page button's question is answered; found is false when an alert was shown. */
     void webPageSettled(bool found);
 

@@ -2,6 +2,7 @@
 
 #include "attachments/AttachmentsController.h"
 #include "controller/PelmoController.h"
+#include "controller/PreflightCheck.h"
 #include "controller/RecipientSelection.h"
 #include "gui/AboutDialog.h"
 #include "gui/AlertBox.h"
@@ -11,6 +12,8 @@
 #include "gui/LogWindow.h"
 #include "gui/PeoplePicker.h"
 #include "gui/PreferencesDialog.h"
+#include "gui/PreflightDialog.h"
+#include "gui/PreviewDialog.h"
 #include "gui/RecipientsWindow.h"
 #include "gui/SoftwareUpdateWindow.h"
 #include "gui/ToolWindows.h"
@@ -262,7 +265,12 @@ void MainWindow::createActions() {
     m_fileMenu->addSeparator();
     m_fileMenu->addAction(quit);
     m_quitAction = quit;
-    menuBar()->addMenu(LocalizedStringNS("&Message"))->addAction(send);
+    QMenu* message = menuBar()->addMenu(LocalizedStringNS("&Message"));
+    message->addAction(send);
+    message->addAction(LocalizedStringNS("Send Test"), this, [this] { m_controller->sendTest(1); })
+        ->setObjectName(QStringLiteral("sendTestAction"));
+    message->addAction(LocalizedStringNS("Preview…"), this, &MainWindow::showPreview)
+        ->setObjectName(QStringLiteral("previewAction"));
     QMenu* window = menuBar()->addMenu(LocalizedStringNS("&Window"));
     window->addActions({addresses, attachments, recipients, console});
     QMenu* help = menuBar()->addMenu(LocalizedStringNS("&Help"));
@@ -298,12 +306,47 @@ void MainWindow::closeEvent(QCloseEvent* event) {
     });
 }
 
+void MainWindow::checkThenSend() {
+    if (m_preflight) // a second press while the first is being checked
+        return;
+    // The message may have been mended since: the findings shown are checked again.
+    if (m_preflightDialog)
+        m_preflightDialog->close();
+    m_preflight = m_controller->checkBeforeSend(this);
+    connect(m_preflight, &PreflightCheck::finished, this, [this] {
+        PreflightCheck* check = m_preflight;
+        check->deleteLater();
+        m_preflight = nullptr;
+        if (check->findings().isEmpty())
+            return m_controller->send();
+        QStringList texts;
+        for (const PreflightCheck::Finding& finding : check->findings())
+            texts << finding.text;
+        m_preflightDialog = new PreflightDialog(texts, this);
+        connect(m_preflightDialog, &QDialog::accepted, m_controller, &PelmoController::send);
+        // Not modal: the user may look at the message, or mend it, while the list is shown.
+        m_preflightDialog->show();
+    });
+}
+
+void MainWindow::showPreview() {
+    if (!m_preview)
+        m_preview = new PreviewDialog(*m_controller, this);
+    else
+        m_preview->reload();
+    m_preview->show();
+    m_preview->raise();
+    m_preview->activateWindow();
+}
+
 void MainWindow::sendPressed() {
     // Stop, and a group's run, go at once: the checks are for the one copy typed in the fields.
     if (m_sendButton->text() == LocalizedStringNS("Send"))
         m_sentDraft = draft();
-    if (m_sendButton->text() != LocalizedStringNS("Send") || m_controller->getPeople())
+    if (m_sendButton->text() != LocalizedStringNS("Send"))
         return m_controller->send();
+    if (m_controller->getPeople())
+        return checkThenSend();
     const QString to = m_to->text().trimmed();
     if (!IsAddrSpec(to)) {
         beep();

@@ -3,6 +3,7 @@
 #include "controller/PelmoView.h"
 
 #include <QMainWindow>
+#include <QPointer>
 
 class AddressBook;
 class AttachmentsController;
@@ -12,6 +13,9 @@ class PasswordStore;
 class PelmoController;
 class PeoplePicker;
 class PreferencesDialog;
+class PreflightCheck;
+class PreviewDialog;
+class QDialog;
 class QLabel;
 class QLineEdit;
 class QProgressBar;
@@ -91,6 +95,8 @@ public:
     void showAttachments();
     /** Opens the preferences as a window-modal dialog. */
     void showPreferences();
+    /** Message ▸ Preview…: the copy a chosen member will receive. */
+    void showPreview();
     /** Brings the activity log to the front, at its latest line that reads line if given. */
     void showLog(const QString& line = QString());
 
@@ -104,6 +110,8 @@ private:
      * address already mailed in this session and an empty subject are asked about.
      */
     void sendPressed();
+    /** A group's run goes once the check before it finds nothing, or the user says so. */
+    void checkThenSend();
     /** The subject, web page and message as they stand, to tell unsent text from sent. */
     QString draft() const;
     void showStatus();
@@ -134,6 +142,11 @@ private:
     PeoplePicker* m_picker = nullptr;
     RecipientsWindow* m_recipients = nullptr;
     PreferencesDialog* m_preferences = nullptr;
+    PreviewDialog* m_preview = nullptr;
+    /** The check before a group's run, while it is under way. */
+    QPointer<PreflightCheck> m_preflight;
+    /** Its findings, while shown; a new press of Send checks again. */
+    QPointer<QDialog> m_preflightDialog;
     AttachmentsWindow* m_attachmentsWindow = nullptr;
     SoftwareUpdateWindow* m_softwareUpdateWindow = nullptr;
     LogWindow* m_logWindow = nullptr;

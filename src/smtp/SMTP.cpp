@@ -85,26 +85,30 @@ void SMTP::startOnOpenSession() {
     });
 }
 
+void SMTP::assemble(const DeliveryRequest& request, MessageAssembly& message) {
+    message.setSubject(request.subject);
+    message.setFrom(request.senderName, request.sender);
+    message.setTo(request.recipientName, request.recipient);
+    for (qsizetype i = 0; i < request.bodyParts.size(); ++i) {
+        const DeliveryRequest::BodyPart& part = request.bodyParts.at(i);
+        if (i == 0 && !request.plainAlternative.isNull())
+            message.addAlternativeBodyParts(request.plainAlternative, part.text,
+                                            request.characterSet);
+        else
+            message.addBodyPart(part.text, part.mimeType, request.characterSet);
+    }
+    message.setListUnsubscribe(request.listUnsubscribe);
+    // A file that has gone or cannot be read is left out without a word.
+    for (const QString& path : request.attachments)
+        message.addAttachment(path);
+}
+
 // Builds the message, hands it to the session and listens to the session; throws as the
 // assembly does.
 void SMTP::setMessage() {
     m_succeeded = false;
     MessageAssembly message;
-    message.setSubject(m_request.subject);
-    message.setFrom(m_request.senderName, m_request.sender);
-    message.setTo(m_request.recipientName, m_request.recipient);
-    for (qsizetype i = 0; i < m_request.bodyParts.size(); ++i) {
-        const DeliveryRequest::BodyPart& part = m_request.bodyParts.at(i);
-        if (i == 0 && !m_request.plainAlternative.isNull())
-            message.addAlternativeBodyParts(m_request.plainAlternative, part.text,
-                                            m_request.characterSet);
-        else
-            message.addBodyPart(part.text, part.mimeType, m_request.characterSet);
-    }
-    message.setListUnsubscribe(m_request.listUnsubscribe);
-    // A file that has gone or cannot be read is left out without a word.
-    for (const QString& path : std::as_const(m_request.attachments))
-        message.addAttachment(path);
+    assemble(m_request, message);
     m_messageId = message.messageId();
     m_session->setMessage(message.toBytes(), message.envelopeSender(),
                           message.envelopeRecipients());

@@ -5,6 +5,7 @@
 #include <QObject>
 #include <QPointer>
 
+class MessageAssembly;
 class SmtpSession;
 
 /**
@@ -65,6 +66,9 @@ public:
     /** Whether the message went out whole before the delivery ended, so that it may have
      * arrived even though its acceptance was never read. */
     bool messageWritten() const { return m_messageWritten; }
+
+    /** The message a delivery of request sends, built into message (an empty one). */
+    static void assemble(const DeliveryRequest& request, MessageAssembly& message);
 
     State state() const { return m_state; }
     /** True once the server accepted the message. */

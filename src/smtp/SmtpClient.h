@@ -105,6 +105,7 @@ public:
     QByteArray lastResponse() const override;
     QString errorString() const override;
     bool messageWritten() const override { return m_messageWritten; }
+    qint64 sizeLimit() const override { return m_capabilities.sizeLimit; }
 
     State state() const { return m_state; }
     /** Implicit TLS on another port than 465, for servers set up so; only before connecting. */
