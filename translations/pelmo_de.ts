@@ -1355,6 +1355,90 @@
         <source>Try again when the server is busy (after 30 s, 2 min, 8 min)</source>
         <translation>Erneut versuchen, wenn der Server ausgelastet ist (nach 30 s, 2 min, 8 min)</translation>
     </message>
+    <message>
+        <source>There is no copy %1: %2 members are to be mailed.</source>
+        <translation>Es gibt keine Ausfertigung %1: %2 Mitglieder sind anzuschreiben.</translation>
+    </message>
+    <message>
+        <source>There is no copy %1: one copy goes to the Recipient Address.</source>
+        <translation>Es gibt keine Ausfertigung %1: eine Ausfertigung geht an die Empfängeradresse.</translation>
+    </message>
+    <message>
+        <source>Test copy for %1 &lt;%2&gt;, to %3.</source>
+        <translation>Testausfertigung für %1 &lt;%2&gt;, an %3.</translation>
+    </message>
+    <message>
+        <source>The subject is empty.</source>
+        <translation>Der Betreff ist leer.</translation>
+    </message>
+    <message>
+        <source>&quot;%1&quot; is not a tag and goes out as written; the tags are {to}, {toName}, {from}, {fromName} and {subject}.</source>
+        <translation>„%1“ ist kein Platzhalter und wird so verschickt, wie es dasteht; die Platzhalter sind {to}, {toName}, {from}, {fromName} und {subject}.</translation>
+    </message>
+    <message>
+        <source>The attachment &quot;%1&quot; is missing.</source>
+        <translation>Der Anhang „%1“ fehlt.</translation>
+    </message>
+    <message>
+        <source>The attachment &quot;%1&quot; cannot be read.</source>
+        <translation>Der Anhang „%1“ kann nicht gelesen werden.</translation>
+    </message>
+    <message>
+        <source>Each copy is %1 MB, more than the %2 MB that %3 accepts.</source>
+        <translation>Jede Ausfertigung ist %1 MB groß, mehr als die %2 MB, die %3 annimmt.</translation>
+    </message>
+    <message>
+        <source>Each copy is %1 MB, more than the 25 MB that many mail servers accept.</source>
+        <translation>Jede Ausfertigung ist %1 MB groß, mehr als die 25 MB, die viele Mailserver annehmen.</translation>
+    </message>
+    <message>
+        <source>The web page %1 does not answer: %2</source>
+        <translation>Die Webseite %1 antwortet nicht: %2</translation>
+    </message>
+    <message>
+        <source>Send Test</source>
+        <translation>Test senden</translation>
+    </message>
+    <message>
+        <source>Preview…</source>
+        <translation>Vorschau…</translation>
+    </message>
+    <message>
+        <source>Before Sending</source>
+        <translation>Vor dem Senden</translation>
+    </message>
+    <message>
+        <source>Look at these before the group is mailed:</source>
+        <translation>Bitte prüfen Sie dies, bevor die Gruppe angeschrieben wird:</translation>
+    </message>
+    <message>
+        <source>Send Anyway</source>
+        <translation>Trotzdem senden</translation>
+    </message>
+    <message>
+        <source>Preview</source>
+        <translation>Vorschau</translation>
+    </message>
+    <message>
+        <source>Copy for:</source>
+        <translation>Ausfertigung für:</translation>
+    </message>
+    <message>
+        <source>Mail this copy to your own address</source>
+        <translation>Diese Ausfertigung an Ihre eigene Adresse schicken</translation>
+    </message>
+    <message>
+        <source>No attachments.</source>
+        <translation>Keine Anhänge.</translation>
+    </message>
+    <message>
+        <source>%1 (%2)</source>
+        <translation>%1 (%2)</translation>
+    </message>
+    <message>
+        <source>%1 (cannot be read: left out)</source>
+        <translation>%1 (nicht lesbar: ausgelassen)</translation>
+    </message>
 </context>
 <context>
     <name>SmtpClient</name>

@@ -1355,6 +1355,90 @@
         <source>Try again when the server is busy (after 30 s, 2 min, 8 min)</source>
         <translation>Réessayer quand le serveur est occupé (après 30 s, 2 min, 8 min)</translation>
     </message>
+    <message>
+        <source>There is no copy %1: %2 members are to be mailed.</source>
+        <translation>Il n’y a pas d’exemplaire %1 : %2 membres sont à contacter.</translation>
+    </message>
+    <message>
+        <source>There is no copy %1: one copy goes to the Recipient Address.</source>
+        <translation>Il n’y a pas d’exemplaire %1 : un seul exemplaire part vers l’adresse du destinataire.</translation>
+    </message>
+    <message>
+        <source>Test copy for %1 &lt;%2&gt;, to %3.</source>
+        <translation>Exemplaire de test pour %1 &lt;%2&gt;, envoyé à %3.</translation>
+    </message>
+    <message>
+        <source>The subject is empty.</source>
+        <translation>Le sujet est vide.</translation>
+    </message>
+    <message>
+        <source>&quot;%1&quot; is not a tag and goes out as written; the tags are {to}, {toName}, {from}, {fromName} and {subject}.</source>
+        <translation>« %1 » n’est pas une balise et part tel quel ; les balises sont {to}, {toName}, {from}, {fromName} et {subject}.</translation>
+    </message>
+    <message>
+        <source>The attachment &quot;%1&quot; is missing.</source>
+        <translation>La pièce jointe « %1 » est introuvable.</translation>
+    </message>
+    <message>
+        <source>The attachment &quot;%1&quot; cannot be read.</source>
+        <translation>La pièce jointe « %1 » ne peut pas être lue.</translation>
+    </message>
+    <message>
+        <source>Each copy is %1 MB, more than the %2 MB that %3 accepts.</source>
+        <translation>Chaque exemplaire fait %1 Mo, plus que les %2 Mo qu’accepte %3.</translation>
+    </message>
+    <message>
+        <source>Each copy is %1 MB, more than the 25 MB that many mail servers accept.</source>
+        <translation>Chaque exemplaire fait %1 Mo, plus que les 25 Mo qu’acceptent beaucoup de serveurs de messagerie.</translation>
+    </message>
+    <message>
+        <source>The web page %1 does not answer: %2</source>
+        <translation>La page web %1 ne répond pas : %2</translation>
+    </message>
+    <message>
+        <source>Send Test</source>
+        <translation>Envoyer un test</translation>
+    </message>
+    <message>
+        <source>Preview…</source>
+        <translation>Aperçu…</translation>
+    </message>
+    <message>
+        <source>Before Sending</source>
+        <translation>Avant l’envoi</translation>
+    </message>
+    <message>
+        <source>Look at these before the group is mailed:</source>
+        <translation>Vérifiez ces points avant d’écrire au groupe :</translation>
+    </message>
+    <message>
+        <source>Send Anyway</source>
+        <translation>Envoyer quand même</translation>
+    </message>
+    <message>
+        <source>Preview</source>
+        <translation>Aperçu</translation>
+    </message>
+    <message>
+        <source>Copy for:</source>
+        <translation>Exemplaire pour :</translation>
+    </message>
+    <message>
+        <source>Mail this copy to your own address</source>
+        <translation>Envoyer cet exemplaire à votre propre adresse</translation>
+    </message>
+    <message>
+        <source>No attachments.</source>
+        <translation>Aucune pièce jointe.</translation>
+    </message>
+    <message>
+        <source>%1 (%2)</source>
+        <translation>%1 (%2)</translation>
+    </message>
+    <message>
+        <source>%1 (cannot be read: left out)</source>
+        <translation>%1 (illisible : laissé de côté)</translation>
+    </message>
 </context>
 <context>
     <name>SmtpClient</name>
