@@ -1324,10 +1324,6 @@
         <translation>Wiederherstellen</translation>
     </message>
     <message>
-        <source>Go on when the server refuses a recipient (and group those refused)</source>
-        <translation>Weitermachen, wenn der Server einen Empfänger ablehnt (und die Abgelehnten in einer Gruppe sammeln)</translation>
-    </message>
-    <message>
         <source>Pace</source>
         <translation>Tempo</translation>
     </message>
@@ -1350,10 +1346,6 @@
     <message>
         <source>At most per hour:</source>
         <translation>Höchstens pro Stunde:</translation>
-    </message>
-    <message>
-        <source>Try again when the server is busy (after 30 s, 2 min, 8 min)</source>
-        <translation>Erneut versuchen, wenn der Server ausgelastet ist (nach 30 s, 2 min, 8 min)</translation>
     </message>
     <message>
         <source>There is no copy %1: %2 members are to be mailed.</source>
@@ -1438,6 +1430,22 @@
     <message>
         <source>%1 (cannot be read: left out)</source>
         <translation>%1 (nicht lesbar: ausgelassen)</translation>
+    </message>
+    <message>
+        <source>Skip a recipient the server refuses</source>
+        <translation>Empfänger überspringen, die der Server ablehnt</translation>
+    </message>
+    <message>
+        <source>The run goes on, and those refused are put in a new group to send to again later</source>
+        <translation>Der Versand geht weiter; die Abgelehnten kommen in eine neue Gruppe, an die später erneut gesendet werden kann</translation>
+    </message>
+    <message>
+        <source>Try again when the server is busy</source>
+        <translation>Erneut versuchen, wenn der Server ausgelastet ist</translation>
+    </message>
+    <message>
+        <source>After 30 s, 2 min and 8 min; then the run stops as for any refusal</source>
+        <translation>Nach 30 s, 2 min und 8 min; danach hält der Versand an wie bei jeder Ablehnung</translation>
     </message>
 </context>
 <context>

@@ -1324,10 +1324,6 @@
         <translation>Rétablir</translation>
     </message>
     <message>
-        <source>Go on when the server refuses a recipient (and group those refused)</source>
-        <translation>Continuer quand le serveur refuse un destinataire (et regrouper les refusés)</translation>
-    </message>
-    <message>
         <source>Pace</source>
         <translation>Rythme</translation>
     </message>
@@ -1350,10 +1346,6 @@
     <message>
         <source>At most per hour:</source>
         <translation>Au plus par heure :</translation>
-    </message>
-    <message>
-        <source>Try again when the server is busy (after 30 s, 2 min, 8 min)</source>
-        <translation>Réessayer quand le serveur est occupé (après 30 s, 2 min, 8 min)</translation>
     </message>
     <message>
         <source>There is no copy %1: %2 members are to be mailed.</source>
@@ -1438,6 +1430,22 @@
     <message>
         <source>%1 (cannot be read: left out)</source>
         <translation>%1 (illisible : laissé de côté)</translation>
+    </message>
+    <message>
+        <source>Skip a recipient the server refuses</source>
+        <translation>Passer un destinataire que le serveur refuse</translation>
+    </message>
+    <message>
+        <source>The run goes on, and those refused are put in a new group to send to again later</source>
+        <translation>L’envoi continue, et les destinataires refusés sont placés dans un nouveau groupe auquel écrire plus tard</translation>
+    </message>
+    <message>
+        <source>Try again when the server is busy</source>
+        <translation>Réessayer quand le serveur est occupé</translation>
+    </message>
+    <message>
+        <source>After 30 s, 2 min and 8 min; then the run stops as for any refusal</source>
+        <translation>Après 30 s, 2 min et 8 min ; ensuite l’envoi s’arrête comme pour tout refus</translation>
     </message>
 </context>
 <context>

@@ -162,9 +162,12 @@ QGroupBox* PreferencesDialog::createMessage() {
     form->addRow(QString(), m_plainAlternative);
     addText(form, LocalizedKey("Unsubscribe address:"), Key::ListUnsubscribe)
         ->setPlaceholderText(LocalizedStringNS("mailto: or https: address (optional)"));
-    m_continueAfterRefusal = new QCheckBox(
-        LocalizedStringNS("Go on when the server refuses a recipient (and group those refused)"));
+    m_continueAfterRefusal =
+        new QCheckBox(LocalizedStringNS("Skip a recipient the server refuses"));
     nameAfter(m_continueAfterRefusal, Key::ContinueAfterRefusal);
+    m_continueAfterRefusal->setToolTip(
+        LocalizedStringNS("The run goes on, and those refused are put in a new group to send to "
+                          "again later"));
     form->addRow(QString(), m_continueAfterRefusal);
     return box;
 }
@@ -220,10 +223,10 @@ QGroupBox* PreferencesDialog::createPace() {
     m_hourlyLimit->setSpecialValueText(LocalizedStringNS("No limit"));
     m_hourlyLimit->setToolTip(LocalizedStringNS("Messages in any hour, for servers that limit it"));
     form->addRow(LocalizedStringNS("At most per hour:"), m_hourlyLimit);
-    m_retryTemporary =
-        new QCheckBox(LocalizedStringNS("Try again when the server is busy (after 30 s, 2 min, "
-                                        "8 min)"));
+    m_retryTemporary = new QCheckBox(LocalizedStringNS("Try again when the server is busy"));
     nameAfter(m_retryTemporary, Key::RetryTemporaryFailures);
+    m_retryTemporary->setToolTip(
+        LocalizedStringNS("After 30 s, 2 min and 8 min; then the run stops as for any refusal"));
     form->addRow(QString(), m_retryTemporary);
     return box;
 }
