@@ -364,11 +364,22 @@ void SmtpClient::enter(State state) {
         return;
     case State::Connecting:
         return startTimer(connectLimit);
-    case State::DataEnd:
-        return startTimer(dataEndLimit);
-    default:
+    case State::AwaitingSSL:
+    case State::SSLHandshake:
+    case State::Greeting:
+    case State::TLSHandshake:
         return startTimer(replyLimit);
+    case State::DataEnd:
+        startTimer(dataEndLimit);
+        break;
+    default:
+        startTimer(replyLimit);
+        break;
     }
+    // What was just written leaves now, not on the socket's next turn of the event loop: a
+    // wake-up less for every command. A failed write ends the session in here (finish()), and
+    // every caller returns right after entering a state that waits for a reply.
+    m_socket->flush();
 }
 
 void SmtpClient::startTimer(std::chrono::seconds limit) {
