@@ -54,11 +54,11 @@ QByteArray normalizeLineEnds(const QByteArray& message) {
 
 // RFC 5321 4.5.2: dot-stuffing, then the end of data "CRLF.CRLF" (the message already ends
 // with CRLF). One pass over the dots, which are rare (base64 has none), into one buffer sized
-// for the whole block, so that it leaves in one write.
+// for the whole block (a stuffed dot may grow it), so that it leaves in one write.
 QByteArray dataBlock(const QByteArray& normalized) {
     const QByteArrayView text(normalized);
     QByteArray out;
-    out.reserve(text.size() + 3 + text.count('.'));
+    out.reserve(text.size() + 3);
     qsizetype done = 0;
     for (qsizetype dot = text.indexOf('.'); dot >= 0; dot = text.indexOf('.', dot + 1)) {
         if (dot == 0 || text[dot - 1] == '\n') {
