@@ -8,10 +8,11 @@
 
 ConsoleView::ConsoleView() : m_button(LocalizedStringNS("Send")) {}
 
+// One UTF-8 line a write, as QTextStream writes it, without making a stream for each line.
 void ConsoleView::setStatus(const QString& text) {
-    QTextStream out(stdout);
-    out << text << '\n';
-    out.flush();
+    const QByteArray line = (text + QLatin1Char('\n')).toUtf8();
+    std::fwrite(line.constData(), 1, static_cast<size_t>(line.size()), stdout);
+    std::fflush(stdout);
 }
 
 void ConsoleView::alert(const QString& title, const QString& informativeText) {

@@ -5,10 +5,13 @@
 #include "util/PelmoException.h"
 #include "util/PrivateFiles.h"
 
+#include <QFile>
 #include <QFileInfo>
 
 #include <algorithm>
 #include <iterator>
+
+#include <sys/stat.h>
 
 namespace {
 
@@ -236,12 +239,12 @@ void MailSettings::setValue(Key key, const QVariant& newValue) {
     if (newValue.typeId() == QMetaType::QString && newValue.toString().isEmpty())
         return remove(key);
     store.setValue(name(key), newValue);
-    sync();
+    save();
 }
 
 void MailSettings::remove(Key key) {
     store.remove(name(key));
-    sync();
+    save();
 }
 
 void MailSettings::overrideValue(Key key, const QVariant& newValue) {
@@ -249,7 +252,33 @@ void MailSettings::overrideValue(Key key, const QVariant& newValue) {
 }
 
 void MailSettings::sync() {
+    // Stamped before reading: a save by another process during the read shows next time.
+    const FileStamp now = stampOfFile();
+    if (lastRead == now)
+        return;
+    store.sync();
+    lastRead = now;
+}
+
+void MailSettings::save() {
     store.sync();
     // Saving replaces the file; the new one must be as private as the old.
     MakePrivateFile(pathOf(store.fileName()));
+    // Another process may have saved right after this one: the next sync() reads the file.
+    lastRead.reset();
+}
+
+MailSettings::FileStamp MailSettings::stampOfFile() const {
+    struct stat status {};
+    if (::stat(QFile::encodeName(store.fileName()).constData(), &status) != 0)
+        return {};
+    const auto nanoseconds = [](const timespec& time) {
+        return static_cast<long long>(time.tv_sec) * 1'000'000'000 + time.tv_nsec;
+    };
+    return {true,
+            static_cast<unsigned long long>(status.st_dev),
+            static_cast<unsigned long long>(status.st_ino),
+            static_cast<long long>(status.st_size),
+            nanoseconds(status.st_mtim),
+            nanoseconds(status.st_ctim)};
 }

@@ -15,8 +15,11 @@
  *
  * Reads come from memory; the mailing run syncs the store before each message, so that a
  * change another process just saved is seen by the next message, as one the preferences make
- * in this process is at once. A value overridden for this process (a command-line run
- * with another server) wins over the stored one and is never written. The settings folder and
+ * in this process is at once. The file is read again only when its inode, size or time stamps
+ * differ from the last look, so a run of many copies pays one stat() a copy, not a parse (an
+ * edit in place that keeps the size within the file system's clock tick goes unseen until the
+ * next change, as with QSettings' own check). A value overridden for this process (a command-line
+ * run with another server) wins over the stored one and is never written. The settings folder and
  * file are kept private to the user (0700, 0600), as they may hold the password.
  */
 class MailSettings {
@@ -97,13 +100,24 @@ public:
     void remove(Key key);
     /** Makes value stand for key in this process only, without writing it. */
     void overrideValue(Key key, const QVariant& value);
-    /** Writes pending changes and re-reads what another process saved. */
+    /** Writes pending changes and re-reads what another process saved since the last look. */
     void sync();
 
     /** The settings file's path, for telling the user where a password is kept. */
     QString fileName() const { return store.fileName(); }
 
 private:
+    /** The file as last read: equal stamps mean nothing to read again. */
+    struct FileStamp {
+        bool operator==(const FileStamp&) const = default;
+        bool exists = false;
+        unsigned long long device = 0, inode = 0;
+        long long size = 0, modified = 0, changed = 0;
+    };
+    FileStamp stampOfFile() const;
+    void save();
+
     QSettings store;
     QVariantMap overrides;
+    std::optional<FileStamp> lastRead;
 };

@@ -8,6 +8,7 @@
 
 #include <QFile>
 #include <QFileInfo>
+#include <QRandomGenerator>
 #include <QUrl>
 
 #include <gmime/gmime.h>
@@ -34,6 +35,27 @@ GMimeMessage* newMessage() {
     return g_mime_message_new(TRUE);
 }
 
+// Boundaries and Message-IDs need to be unique, not secret: the process's generator, seeded
+// once from the system, serves them, where GMime would open /dev/urandom for each.
+QRandomGenerator& uniqueSource() {
+    return *QRandomGenerator::global();
+}
+
+// GMime's own form, "=-" and 20 base64 characters (120 bits).
+QByteArray newBoundary() {
+    quint32 random[4];
+    uniqueSource().fillRange(random);
+    return "=-" + QByteArray(reinterpret_cast<const char*>(random), 15).toBase64();
+}
+
+GMimeMultipart* newMultipart(const char* subtype) {
+    auto* multipart = static_cast<GMimeMultipart*>(g_object_new(GMIME_TYPE_MULTIPART, nullptr));
+    const GPointer<GMimeContentType> type(g_mime_content_type_new("multipart", subtype));
+    g_mime_object_set_content_type(GMIME_OBJECT(multipart), type.get());
+    g_mime_multipart_set_boundary(multipart, newBoundary().constData());
+    return multipart;
+}
+
 bool breaksHeaderLine(QChar c) {
     return c == QLatin1Char('\r') || c == QLatin1Char('\n') || c == QChar(u'\0');
 }
@@ -58,8 +80,15 @@ QString attachmentDescription(QString fileName) {
     return LocalizedString("name of the attachment \"%1\"").arg(fileName);
 }
 
-// RFC 5322 3.6.4: GMime's unique left part and the sender's domain, as mailers do; an address
-// without a usable domain (a local user, a domain literal) falls back to localhost.
+// RFC 5322 3.6.4: a unique left part (128 random bits in base 36) and the sender's domain, as
+// mailers do; an address without a usable domain (a local user, a domain literal) falls back to
+// localhost.
+QByteArray newMessageId(const QByteArray& domain) {
+    const auto base36 = [](quint64 random) { return QByteArray::number(random, 36).toUpper(); };
+    return base36(uniqueSource().generate64()) + '.' + base36(uniqueSource().generate64()) + '@' +
+           domain;
+}
+
 QByteArray messageIdDomain(const QString& address) {
     const qsizetype at = address.lastIndexOf(QLatin1Char('@'));
     const QByteArray domain = at < 0 ? QByteArray() : QUrl::toAce(address.mid(at + 1));
@@ -174,7 +203,7 @@ GPointer<GMimePart> bodyPart(const QString& text, const QString& mimeType, int c
 
 struct MessageAssembly::Message {
     GPointer<GMimeMessage> mime{newMessage()};
-    GPointer<GMimeMultipart> parts{g_mime_multipart_new_with_subtype("mixed")};
+    GPointer<GMimeMultipart> parts{newMultipart("mixed")};
     QString sender;
     QString recipient;
 
@@ -199,7 +228,6 @@ void MessageAssembly::Message::setMailbox(GMimeAddressType type, const QString& 
 }
 
 MessageAssembly::MessageAssembly() : message(std::make_unique<Message>()) {
-    g_mime_multipart_set_boundary(message->parts.get(), nullptr);
     g_mime_message_set_mime_part(message->mime.get(), GMIME_OBJECT(message->parts.get()));
     // RFC 5322 3.6.1: the time the message was made, with the local offset.
     GDateTime* now = g_date_time_new_now_local();
@@ -227,9 +255,8 @@ void MessageAssembly::setFrom(const QString& name, const QString& address) {
     message->setMailbox(GMIME_ADDRESS_TYPE_FROM, name, address, LocalizedString("sender's name"),
                         LocalizedString("sender's address"));
     message->sender = address;
-    char* id = g_mime_utils_generate_message_id(messageIdDomain(address).constData());
-    g_mime_message_set_message_id(message->mime.get(), id);
-    g_free(id);
+    g_mime_message_set_message_id(message->mime.get(),
+                                  newMessageId(messageIdDomain(address)).constData());
 }
 
 void MessageAssembly::setTo(const QString& name, const QString& address) {
@@ -246,8 +273,7 @@ void MessageAssembly::addBodyPart(const QString& text, const QString& mimeType,
 
 void MessageAssembly::addAlternativeBodyParts(const QString& plain, const QString& html,
                                               int characterSetIndex) {
-    const GPointer<GMimeMultipart> alternative(g_mime_multipart_new_with_subtype("alternative"));
-    g_mime_multipart_set_boundary(alternative.get(), nullptr);
+    const GPointer<GMimeMultipart> alternative(newMultipart("alternative"));
     g_mime_multipart_add(
         alternative.get(),
         GMIME_OBJECT(bodyPart(plain, QStringLiteral("text/plain"), characterSetIndex).get()));

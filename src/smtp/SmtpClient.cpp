@@ -53,13 +53,20 @@ QByteArray normalizeLineEnds(const QByteArray& message) {
 }
 
 // RFC 5321 4.5.2: dot-stuffing, then the end of data "CRLF.CRLF" (the message already ends
-// with CRLF).
+// with CRLF). One pass over the dots, which are rare (base64 has none), into one buffer sized
+// for the whole block (a stuffed dot may grow it), so that it leaves in one write.
 QByteArray dataBlock(const QByteArray& normalized) {
-    QByteArray out = normalized;
-    out.replace("\r\n.", "\r\n..");
-    if (out.startsWith('.'))
-        out.prepend('.');
-    return out + ".\r\n";
+    const QByteArrayView text(normalized);
+    QByteArray out;
+    out.reserve(text.size() + 3);
+    qsizetype done = 0;
+    for (qsizetype dot = text.indexOf('.'); dot >= 0; dot = text.indexOf('.', dot + 1)) {
+        if (dot == 0 || text[dot - 1] == '\n') {
+            out.append(text.sliced(done, dot - done)).append('.');
+            done = dot;
+        }
+    }
+    return out.append(text.sliced(done)).append(".\r\n", 3);
 }
 
 bool hasLineBreakOrNul(const QString& text) {
@@ -357,11 +364,22 @@ void SmtpClient::enter(State state) {
         return;
     case State::Connecting:
         return startTimer(connectLimit);
-    case State::DataEnd:
-        return startTimer(dataEndLimit);
-    default:
+    case State::AwaitingSSL:
+    case State::SSLHandshake:
+    case State::Greeting:
+    case State::TLSHandshake:
         return startTimer(replyLimit);
+    case State::DataEnd:
+        startTimer(dataEndLimit);
+        break;
+    default:
+        startTimer(replyLimit);
+        break;
     }
+    // What was just written leaves now, not on the socket's next turn of the event loop: a
+    // wake-up less for every command. A failed write ends the session in here (finish()), and
+    // every caller returns right after entering a state that waits for a reply.
+    m_socket->flush();
 }
 
 void SmtpClient::startTimer(std::chrono::seconds limit) {

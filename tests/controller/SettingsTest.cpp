@@ -33,28 +33,46 @@ TEST_F(ControllerFixture, PortIsOneTo65365) {
     }
 }
 
-// The preferences of another process rewrite the file; the next message must go by it.
+// The preferences of another process rewrite the file; the next message must go by it, also
+// when the file comes back with the time stamp it had (cp -p, rsync -t, a restored backup).
 TEST_F(ControllerFixture, TheNextMessageSeesWhatAnotherProcessSaved) {
-    set("serverAddress", QStringLiteral("old.example.org"));
-    EXPECT_EQ(controller->getServer(), QStringLiteral("old.example.org"));
-    QFile rewrite(settings().fileName());
-    ASSERT_TRUE(rewrite.open(QIODevice::WriteOnly | QIODevice::Truncate));
-    rewrite.write("[General]\nserverAddress=new.example.org\nsenderEmail=me@example.org\n"
-                  "senderName=Me\nserverPort=25\n");
-    rewrite.close();
-    ASSERT_TRUE(rewrite.open(QIODevice::ReadWrite));
-    rewrite.setFileTime(QDateTime::currentDateTime().addSecs(5), QFileDevice::FileModificationTime);
-    rewrite.close();
+    const QDateTime lastMinute =
+        QDateTime::fromSecsSinceEpoch(QDateTime::currentSecsSinceEpoch() - 60);
+    const std::pair<const char*, QDateTime> rows[] = {{"later", lastMinute.addSecs(65)},
+                                                      {"kept", lastMinute}};
     QString opened;
     QStringList transcript;
     controller->setSessionFactory([&](const QString& host, int) -> SmtpSession* {
         opened = host;
         return new ScriptedSession({}, transcript);
     });
-    view.toText = QStringLiteral("ann@example.org");
-    view.nameText = QStringLiteral("Ann");
-    runUntilSettled();
-    EXPECT_EQ(opened, QStringLiteral("new.example.org"));
+    const auto stamp = [](const QDateTime& time) {
+        QFile file(settings().fileName());
+        return file.open(QIODevice::ReadWrite) &&
+               file.setFileTime(time, QFileDevice::FileModificationTime);
+    };
+    for (const auto& [row, rewrittenAt] : rows) {
+        clearSettings();
+        set("serverAddress", QStringLiteral("old.example.org"));
+        for (const char* key : {"senderEmail", "senderName"})
+            set(key, QStringLiteral("me@example.org"));
+        set("serverPort", 25);
+        ASSERT_TRUE(stamp(lastMinute));
+        view.toText = QStringLiteral("ann@example.org");
+        view.nameText = QStringLiteral("Ann");
+        runUntilSettled();
+        EXPECT_EQ(opened, QStringLiteral("old.example.org")) << row;
+        QFile rewrite(settings().fileName());
+        ASSERT_TRUE(rewrite.open(QIODevice::WriteOnly | QIODevice::Truncate));
+        rewrite.write("[General]\nserverAddress=other.example.org\nsenderEmail=me@example.org\n"
+                      "senderName=Me\nserverPort=25\n");
+        rewrite.close();
+        ASSERT_TRUE(stamp(rewrittenAt));
+        view.toText = QStringLiteral("ann@example.org");
+        view.nameText = QStringLiteral("Ann");
+        runUntilSettled();
+        EXPECT_EQ(opened, QStringLiteral("other.example.org")) << row;
+    }
 }
 
 // The file may hold the password: nobody else may read it, also after an older Pelmo or an
