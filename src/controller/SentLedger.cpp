@@ -11,12 +11,8 @@
 
 #include <algorithm>
 #include <cerrno>
-#include <condition_variable>
 #include <cstring>
-#include <functional>
-#include <mutex>
 #include <optional>
-#include <thread>
 
 #include <fcntl.h>
 #include <sys/file.h>
@@ -46,8 +42,8 @@ bool plainField(const QString& field) {
     return true;
 }
 
-QString systemError(int error = errno) {
-    return QString::fromLocal8Bit(std::strerror(error));
+QString systemError() {
+    return QString::fromLocal8Bit(std::strerror(errno));
 }
 
 QByteArray readAll(int fd) {
@@ -65,58 +61,10 @@ QByteArray readAll(int fd) {
 
 } // namespace
 
-// The journal's fsync() on a thread of its own. Requests that come while a flush runs are
-// served by one more flush, which covers them all.
-struct SentLedger::Flusher {
-    Flusher(int journal, std::function<void(int error)> onFailure)
-        : fd(journal), failed(std::move(onFailure)), thread([this] { run(); }) {}
-    ~Flusher() {
-        {
-            const std::lock_guard lock(mutex);
-            stopping = true;
-        }
-        wake.notify_one();
-        thread.join();
-    }
-    void request() {
-        {
-            const std::lock_guard lock(mutex);
-            pending = true;
-        }
-        wake.notify_one();
-    }
-
-private:
-    void run() {
-        std::unique_lock lock(mutex);
-        for (;;) {
-            wake.wait(lock, [this] { return pending || stopping; });
-            if (!pending)
-                return;
-            pending = false;
-            lock.unlock();
-            const int error = ::fsync(fd) == 0 ? 0 : errno;
-            lock.lock();
-            if (error != 0)
-                return failed(error);
-        }
-    }
-
-    const int fd;
-    const std::function<void(int error)> failed;
-    std::mutex mutex;
-    std::condition_variable wake;
-    bool pending = false;
-    bool stopping = false;
-    std::thread thread; // last: it starts running at once
-};
-
 SentLedger::SentLedger(const QString& folder, QObject* parent)
     : QObject(parent), m_folder(folder) {}
 
 SentLedger::~SentLedger() {
-    // The flushing thread ends, and has flushed, before the journal is closed.
-    m_flusher.reset();
     if (m_fd >= 0)
         ::close(m_fd);
     for (const Claimed& claimed : std::as_const(m_claimed))
@@ -189,15 +137,6 @@ bool SentLedger::open() {
     m_fd = fd;
     m_path = path;
     m_state = State::Open;
-    m_flusher = std::make_unique<Flusher>(fd, [this](int error) {
-        QMetaObject::invokeMethod(
-            this,
-            [this, error] {
-                if (m_state == State::Open)
-                    fail(systemError(error));
-            },
-            Qt::QueuedConnection);
-    });
     return true;
 }
 
@@ -222,7 +161,10 @@ bool SentLedger::append(const QByteArray& lines) {
         at += written;
         left -= written;
     }
-    m_flusher->request();
+    if (::fsync(m_fd) != 0) {
+        fail(systemError());
+        return false;
+    }
     return true;
 }
 
@@ -265,7 +207,6 @@ void SentLedger::forgetAll() {
 }
 
 void SentLedger::close() {
-    m_flusher.reset();
     if (m_fd >= 0) {
         ::unlink(QFile::encodeName(m_path).constData());
         ::close(m_fd);

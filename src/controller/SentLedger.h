@@ -5,8 +5,6 @@
 #include <QObject>
 #include <QString>
 
-#include <memory>
-
 /**
  * The sent list on disk, so that a Pelmo that is killed, crashes or loses power in the middle
  * of a run still knows whom it mailed. Each session that mails keeps a journal of its own,
@@ -20,18 +18,13 @@
  *   sent  <time> <run> <address> <Message-Id>   the server accepted this copy (250 after DATA)
  *   end   <time> <run>                      the run completed, or the sent list was reset:
  *                                           nothing the run mailed before it is restored
- * Each copy's lines are written with one write() at once, so a crash or kill of Pelmo loses
- * none; the fsync() that makes them survive a power loss runs at once too, but on a thread of
- * its own, so that the next copy does not wait for the disk (a third of a copy's time on a
- * nearby server). Each fsync() covers every line written before it: a power loss can cost the
- * copies accepted during one flush, as it could cost the one being flushed before. A
+ * Each copy's lines are written with one write() and fsync'd before the next copy starts. A
  * last line without its "\n" was torn by the crash and is ignored, as is any line that is not
  * one of the three above. What an unclean session leaves to restore are the addresses of its
  * runs that have no end line.
  *
- * A journal that cannot be written or flushed does not stop the mailing: the failure is
- * reported once, by statusMessage() (a failed flush on the next turn of the event loop), and
- * the session goes on without one (state Failed). Main thread only.
+ * A journal that cannot be written does not stop the mailing: the failure is reported once,
+ * by statusMessage(), and the session goes on without one (state Failed). Main thread only.
  */
 class SentLedger : public QObject {
     Q_OBJECT
@@ -66,8 +59,7 @@ public:
 
     static Reading read(const QByteArray& bytes);
 
-    /** Appends an accepted copy of run and starts its flush; false (and Failed) when it
-     * cannot be written. */
+    /** Appends and syncs an accepted copy of run; false (and Failed) when it cannot. */
     bool recordSent(const QString& run, const QString& address, const QString& messageId);
     /** The run completed: an end line, when the run has any line at all. */
     void finishRun(const QString& run);
@@ -95,8 +87,7 @@ private:
     bool open();
     bool append(const QByteArray& lines);
     void fail(const QString& why);
-    struct Flusher;
-    std::unique_ptr<Flusher> m_flusher;
+
     QString m_folder;
     QString m_path;
     int m_fd = -1;
