@@ -295,11 +295,12 @@ bool MailingRun::retryOnNewSession(SMTP* delivery) {
 }
 
 // RFC 5321 4.2.1: a 5yz reply is a permanent refusal of this transaction only; a 4yz one may
-// succeed later and is not skipped, and 421 concerns the connection.
+// succeed later and is not skipped, and 421 concerns the connection. A refused sender would
+// refuse every copy, so it stops the run as before.
 bool MailingRun::skipRefusedCopy(SMTP* delivery) {
     static const QRegularExpression permanent(QStringLiteral("^5\\d\\d(?:[ -]|$)"));
     if (!m_member || !m_parts.settings.boolean(Key::ContinueAfterRefusal) ||
-        !permanent.match(delivery->failureReason()).hasMatch())
+        !permanent.match(delivery->failureReason()).hasMatch() || delivery->senderRefused())
         return false;
     const Person member = *m_member;
     memberNotMailed(delivery->failureReason());

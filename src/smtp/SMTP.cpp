@@ -263,6 +263,10 @@ void SMTP::closeAfterRefusal() {
     m_session->close();
 }
 
+bool SMTP::senderRefused() const {
+    return m_session && m_session->senderRefused();
+}
+
 void SMTP::reportFailureReason() {
     if (m_session && !m_session->errorString().isEmpty()) {
         status(m_session->errorString());

@@ -79,6 +79,9 @@ public:
      * nothing has failed, and when the connection ended without a word.
      */
     const QString& failureReason() const { return m_failure; }
+    /** Whether the server refused the sender (MAIL FROM) rather than this copy's recipient or
+     *  content: a refusal that every copy would meet. */
+    bool senderRefused() const;
     const DeliveryRequest& request() const { return m_request; }
     /** The message's Message-ID, once the message is built. */
     const QString& messageId() const { return m_messageId; }

@@ -263,6 +263,7 @@ void SmtpClient::setMessage(const QByteArray& message, const QString& sender,
 void SmtpClient::sendMessage() {
     if (!expect(State::Ready, "sendMessage"))
         return;
+    m_senderRefused = false;
     if (const QString problem = envelopeProblem(); !problem.isEmpty())
         return refuseBeforeSending(problem);
     if (m_capabilities.sizeLimit > 0 && m_message.size() > m_capabilities.sizeLimit)
@@ -704,6 +705,7 @@ void SmtpClient::refuseMessage() {
 }
 
 void SmtpClient::onMailFrom(int code) {
+    m_senderRefused = !isPositive(code);
     if (m_pipelined)
         return onPipelinedReply(code, State::RcptTo);
     if (!isPositive(code))

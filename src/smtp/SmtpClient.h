@@ -106,6 +106,7 @@ public:
     QString errorString() const override;
     bool messageWritten() const override { return m_messageWritten; }
     qint64 sizeLimit() const override { return m_capabilities.sizeLimit; }
+    bool senderRefused() const override { return m_senderRefused; }
 
     State state() const { return m_state; }
     /** Implicit TLS on another port than 465, for servers set up so; only before connecting. */
@@ -196,4 +197,5 @@ private:
     /** The envelope that waits for RSET's reply when it cannot go in the same write. */
     QByteArray m_envelope;
     bool m_messageWritten = false;
+    bool m_senderRefused = false;
 };

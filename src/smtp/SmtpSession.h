@@ -54,6 +54,8 @@ public:
      * that may have delivered it, one lost before cannot have.
      */
     virtual bool messageWritten() const { return false; }
+    /** Whether the last refusal answered MAIL FROM: it concerns the sender, so every copy. */
+    virtual bool senderRefused() const { return false; }
     /** The largest message the server takes, from its EHLO SIZE keyword; 0 when unknown. */
     virtual qint64 sizeLimit() const { return 0; }
 

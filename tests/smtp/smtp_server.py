@@ -21,12 +21,20 @@ class Handler:
     def __init__(self, args):
         self.user, self.password = args.user.encode(), args.password.encode()
         self.refused_recipients = set(args.refuse_recipient)
+        self.refused_senders = set(args.refuse_sender)
         # ADDRESS=K: the first K tries of that address are answered 451, as a greylisting or
         # busy server does.
         self.deferrals = {}
         for deferral in args.defer_recipient:
             address, _, times = deferral.rpartition("=")
             self.deferrals[address] = int(times)
+
+    async def handle_MAIL(self, server, session, envelope, address, mail_options):
+        if address in self.refused_senders:
+            return f"553 5.7.1 <{address}>: Sender address rejected"
+        envelope.mail_from = address
+        envelope.mail_options.extend(mail_options)
+        return "250 2.1.0 OK"
 
     async def handle_RCPT(self, server, session, envelope, address, rcpt_options):
         if address in self.refused_recipients:
@@ -83,6 +91,7 @@ if __name__ == "__main__":
     parser.add_argument("--user", default="user")
     parser.add_argument("--password", default="secret")
     parser.add_argument("--refuse-recipient", action="append", default=[])
+    parser.add_argument("--refuse-sender", action="append", default=[])
     parser.add_argument("--defer-recipient", action="append", default=[],
                         help="ADDRESS=K: answer 451 to the first K RCPT TO of ADDRESS")
     parser.add_argument("--size", type=int, default=10 * 1024 * 1024)
