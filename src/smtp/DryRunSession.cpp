@@ -8,8 +8,12 @@ DryRunSession::DryRunSession(const QString& path, QObject* parent)
 
 void DryRunSession::later(void (SmtpSession::*signal)()) {
     QMetaObject::invokeMethod(
-        this, [this, signal] { Q_EMIT(this->*signal)
-                               (); }, Qt::QueuedConnection);
+        this,
+        [this, signal] {
+            Q_EMIT(this->*signal)
+            ();
+        },
+        Qt::QueuedConnection);
 }
 
 void DryRunSession::connectInBackgroundAndNotify() {

@@ -56,10 +56,10 @@ private:
 
 /** What a positive EHLO reply announces of what the client uses. */
 struct SmtpCapabilities {
-    QStringList mechanisms; ///< AUTH (RFC 4954 3), upper-case, each once
-    bool size = false;      ///< SIZE (RFC 1870)
-    qint64 sizeLimit = 0;   ///< SIZE's limit in bytes; 0 for none
-    bool smtpUtf8 = false;  ///< SMTPUTF8 (RFC 6531 3.2): addresses may be UTF-8
+    QStringList mechanisms;  ///< AUTH (RFC 4954 3), upper-case, each once
+    bool size = false;       ///< SIZE (RFC 1870)
+    qint64 sizeLimit = 0;    ///< SIZE's limit in bytes; 0 for none
+    bool smtpUtf8 = false;   ///< SMTPUTF8 (RFC 6531 3.2): addresses may be UTF-8
     bool pipelining = false; ///< PIPELINING (RFC 2920): commands may go without waiting
 
     static SmtpCapabilities fromEhlo(const SmtpReply& reply);
