@@ -11,7 +11,7 @@ packages=(
   chromium firefox-esr
   libgtest-dev libgmock-dev libbenchmark-dev
   clang libclang-rt-14-dev
-  python3-aiosmtpd openssl python3-lxml
+  python3-aiosmtpd openssl python3-lxml time
   postfix dovecot-core
   libxcb1-dev xvfb
   xdg-utils desktop-file-utils
