@@ -13,34 +13,35 @@ bool standsForItself(unsigned char c, bool last) {
     return c >= 33 && c <= 126 && c != '=';
 }
 
-// RFC 2045 6.7 (1): "=" and the byte in two upper-case hexadecimal digits.
-void appendEscape(QByteArray& out, unsigned char c) {
-    static const char digits[] = "0123456789ABCDEF";
-    out += '=';
-    out += digits[c >> 4];
-    out += digits[c & 0x0f];
-}
-
 } // namespace
 
 QByteArray EncodeQuotedPrintable(const QByteArray& bytes) {
-    QByteArray out;
-    out.reserve(bytes.size() * 3);
+    static const char digits[] = "0123456789ABCDEF";
+    // Written through a pointer into a buffer sized for the worst case: every byte escaped, and
+    // a soft break at least every 73 characters. An attachment goes through here for every copy.
+    const qsizetype n = bytes.size();
+    QByteArray out(3 * n + 2 * (3 * n / (maxEncodedChars - 2) + 1), Qt::Uninitialized);
+    char* to = out.data();
     qsizetype lineLength = 0;
-    for (qsizetype i = 0; i < bytes.size(); ++i) {
+    for (qsizetype i = 0; i < n; ++i) {
         const auto c = static_cast<unsigned char>(bytes[i]);
-        const bool literal = standsForItself(c, i + 1 == bytes.size());
+        const bool literal = standsForItself(c, i + 1 == n);
         const qsizetype width = literal ? 1 : 3;
         // An escape is never split across a soft break.
         if (lineLength + width > maxEncodedChars) {
-            out += "=\n";
+            *to++ = '=';
+            *to++ = '\n';
             lineLength = 0;
         }
-        if (literal)
-            out += static_cast<char>(c);
-        else
-            appendEscape(out, c);
+        if (literal) {
+            *to++ = static_cast<char>(c);
+        } else { // RFC 2045 6.7 (1): "=" and the byte in two upper-case hexadecimal digits.
+            *to++ = '=';
+            *to++ = digits[c >> 4];
+            *to++ = digits[c & 0x0f];
+        }
         lineLength += width;
     }
+    out.truncate(to - out.constData());
     return out;
 }
