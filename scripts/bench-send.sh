@@ -67,15 +67,13 @@ for _ in $(seq "$rounds"); do
   echo "rich $(run_pelmo 0 message.html)" >> "$work/times"
   echo "source $(run_source)" >> "$work/times"
 done
-python3 - "$work/times" "$copies" <<'PY'
-import statistics, sys
-times = {}
-for line in open(sys.argv[1]):
-    kind, seconds = line.split()
-    times.setdefault(kind, []).append(float(seconds))
+python3 - "$work/times" "$copies" "$(dirname "$0")" <<'PY'
+import sys
+sys.path.insert(0, sys.argv[3])
+from bench_medians import per_copy
 copies = int(sys.argv[2])
-per = {kind: statistics.median(values) / copies * 1000 for kind, values in times.items()}
-print(f"mailing run, {copies} copies of 20 KB through smtp-sink, medians of {len(times['source'])} "
+per, rounds = per_copy(sys.argv[1], copies)
+print(f"mailing run, {copies} copies of 20 KB through smtp-sink, medians of {rounds} "
       f"interleaved rounds, per copy (whole process):")
 for kind in ("plain", "rich"):
     print(f"  pelmo send, {kind} text: {per[kind]:.2f} ms, ratio to smtp-source "

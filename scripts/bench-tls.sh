@@ -222,16 +222,14 @@ for _ in $(seq "$rounds"); do
   echo "smtplib $whole" >> "$work/times"
   echo "loop $loop" >> "$work/times"
 done
-python3 - "$work/times" "$copies" <<'PY'
-import statistics, sys
-times = {}
-for line in open(sys.argv[1]):
-    kind, seconds = line.split()
-    times.setdefault(kind, []).append(float(seconds))
+python3 - "$work/times" "$copies" "$(dirname "$0")" <<'PY'
+import sys
+sys.path.insert(0, sys.argv[3])
+from bench_medians import per_copy
 copies = int(sys.argv[2])
-per = {kind: statistics.median(values) / copies * 1000 for kind, values in times.items()}
+per, rounds = per_copy(sys.argv[1], copies)
 print(f"mailing run, {copies} copies of 20 KB through Postfix with STARTTLS and AUTH PLAIN, "
-      f"medians of {len(times['pelmo'])} interleaved rounds, per copy (whole process):")
+      f"medians of {rounds} interleaved rounds, per copy (whole process):")
 print(f"  pelmo send: {per['pelmo']:.2f} ms, ratio to smtplib {per['pelmo'] / per['smtplib']:.2f}")
 print(f"  Python smtplib loop: {per['smtplib']:.2f} ms; the loop alone, without the "
       f"interpreter's start: {per['loop']:.2f} ms (pelmo's ratio to it {per['pelmo'] / per['loop']:.2f})")
