@@ -255,6 +255,7 @@ void MailingRun::deliver() {
         settleUnlessDelivering();
     });
     connect(delivery, &SMTP::finished, this, [this, delivery] { deliveryFinished(delivery); });
+    Q_EMIT copyStarting();
     if (open) {
         ++m_sessionCopies;
         delivery->startOnOpenSession();

@@ -126,11 +126,15 @@ void PelmoController::send() {
     MailingRun* started = run;
     const QString runId = QUuid::createUuid().toString(QUuid::WithoutBraces);
     connect(started, &MailingRun::statusMessage, this, &PelmoController::statusMsg);
-    if (ledgerKept)
+    if (ledgerKept) {
         connect(started, &MailingRun::copyAccepted, ledger,
                 [this, runId](const QString& recipient, const QString& messageId) {
                     ledger->recordSent(runId, recipient, messageId);
                 });
+        // The last accepted copy is on disk before the next one can be accepted.
+        connect(started, &MailingRun::copyStarting, ledger, &SentLedger::waitUntilDurable,
+                Qt::DirectConnection);
+    }
     connect(started, &MailingRun::stateChanged, ledger, [this, runId](MailingRun::State state) {
         if (state == MailingRun::State::Completed)
             ledger->finishRun(runId);

@@ -11,8 +11,13 @@
 
 #include <algorithm>
 #include <cerrno>
+#include <condition_variable>
+#include <cstdint>
 #include <cstring>
+#include <mutex>
 #include <optional>
+#include <thread>
+#include <utility>
 
 #include <fcntl.h>
 #include <sys/file.h>
@@ -61,12 +66,75 @@ QByteArray readAll(int fd) {
 
 } // namespace
 
+// One thread per open journal, asleep between copies: a sync takes longer than the rest of a
+// copy's work on the main thread, and asked for as soon as a line is written it is most often
+// over by the time the next copy is ready.
+class SentLedger::Syncer {
+public:
+    explicit Syncer(int fd) : m_fd(fd), m_thread([this] { work(); }) {}
+
+    // Ends once the last sync asked for is done.
+    ~Syncer() {
+        {
+            const std::lock_guard lock(m_mutex);
+            m_stopping = true;
+        }
+        m_wake.notify_one();
+        m_thread.join();
+    }
+
+    void request() {
+        {
+            const std::lock_guard lock(m_mutex);
+            ++m_asked;
+        }
+        m_wake.notify_one();
+    }
+
+    /** The errno of a sync that failed since the last call, or 0. */
+    int wait() {
+        std::unique_lock lock(m_mutex);
+        m_done.wait(lock, [this] { return m_synced == m_asked; });
+        return std::exchange(m_error, 0);
+    }
+
+private:
+    void work() {
+        std::unique_lock lock(m_mutex);
+        for (;;) {
+            m_wake.wait(lock, [this] { return m_stopping || m_synced != m_asked; });
+            if (m_synced == m_asked)
+                return;
+            // fsync covers every write made before it starts, those asked for meanwhile too.
+            const std::uint64_t target = m_asked;
+            lock.unlock();
+            int failed = 0;
+            while (::fsync(m_fd) != 0 && (failed = errno) == EINTR)
+                failed = 0;
+            lock.lock();
+            if (failed != 0 && m_error == 0)
+                m_error = failed;
+            m_synced = target;
+            m_done.notify_all();
+        }
+    }
+
+    const int m_fd;
+    std::mutex m_mutex;
+    std::condition_variable m_wake;
+    std::condition_variable m_done;
+    std::uint64_t m_asked = 0;
+    std::uint64_t m_synced = 0;
+    int m_error = 0;
+    bool m_stopping = false;
+    std::thread m_thread;
+};
+
 SentLedger::SentLedger(const QString& folder, QObject* parent)
     : QObject(parent), m_folder(folder) {}
 
 SentLedger::~SentLedger() {
-    if (m_fd >= 0)
-        ::close(m_fd);
+    closeJournal();
     for (const Claimed& claimed : std::as_const(m_claimed))
         ::close(claimed.fd);
 }
@@ -136,6 +204,7 @@ bool SentLedger::open() {
     }
     m_fd = fd;
     m_path = path;
+    m_syncer = std::make_unique<Syncer>(fd);
     m_state = State::Open;
     return true;
 }
@@ -161,11 +230,26 @@ bool SentLedger::append(const QByteArray& lines) {
         at += written;
         left -= written;
     }
-    if (::fsync(m_fd) != 0) {
+    m_syncer->request();
+    return true;
+}
+
+bool SentLedger::waitUntilDurable() {
+    if (!m_syncer || m_state != State::Open)
+        return m_state != State::Failed;
+    if (const int failed = m_syncer->wait(); failed != 0) {
+        errno = failed;
         fail(systemError());
         return false;
     }
     return true;
+}
+
+void SentLedger::closeJournal() {
+    m_syncer.reset();
+    if (m_fd >= 0)
+        ::close(m_fd);
+    m_fd = -1;
 }
 
 void SentLedger::fail(const QString& why) {
@@ -209,8 +293,7 @@ void SentLedger::forgetAll() {
 void SentLedger::close() {
     if (m_fd >= 0) {
         ::unlink(QFile::encodeName(m_path).constData());
-        ::close(m_fd);
-        m_fd = -1;
+        closeJournal();
     }
     m_state = State::Closed;
 }

@@ -5,6 +5,8 @@
 #include <QObject>
 #include <QString>
 
+#include <memory>
+
 /**
  * The sent list on disk, so that a Pelmo that is killed, crashes or loses power in the middle
  * of a run still knows whom it mailed. Each session that mails keeps a journal of its own,
@@ -18,7 +20,10 @@
  *   sent  <time> <run> <address> <Message-Id>   the server accepted this copy (250 after DATA)
  *   end   <time> <run>                      the run completed, or the sent list was reset:
  *                                           nothing the run mailed before it is restored
- * Each copy's lines are written with one write() and fsync'd before the next copy starts. A
+ * Each copy's lines are written with one write() at once, so that a Pelmo that is killed loses
+ * none, and fsync'd on a thread of their own while the copy's conversation ends; the run calls
+ * waitUntilDurable() before the next copy goes out, so that a power loss can cost at most the
+ * record of the one copy just accepted, as it could with a wait right after the write. A
  * last line without its "\n" was torn by the crash and is ignored, as is any line that is not
  * one of the three above. What an unclean session leaves to restore are the addresses of its
  * runs that have no end line.
@@ -65,6 +70,9 @@ public:
     void finishRun(const QString& run);
     /** The sent list was emptied: every run's copies so far are no longer to be restored. */
     void forgetAll();
+    /** Returns once every line written is on disk; false (and Failed) when the disk refused
+     * them. Blocks only for the rest of a sync already under way. */
+    bool waitUntilDurable();
     /** A clean quit: the journal is removed. */
     void close();
 
@@ -87,10 +95,15 @@ private:
     bool open();
     bool append(const QByteArray& lines);
     void fail(const QString& why);
+    void closeJournal();
+
+    class Syncer;
 
     QString m_folder;
     QString m_path;
     int m_fd = -1;
+    /** Syncs m_fd in the background while the journal is open. */
+    std::unique_ptr<Syncer> m_syncer;
     State m_state = State::Unopened;
     /** Runs that have a start line in the journal. */
     QList<QString> m_started;
