@@ -1,9 +1,9 @@
 #!/usr/bin/env bash
 # Whole mailing runs against Postfix's smtp-sink on 127.0.0.1: COPIES copies of a 20 KB message
-# sent by `pelmo send --group`, as plain text and as rich text (HTML), and the same number of
-# 20 KB messages sent by smtp-source with one connection per message, the protocol's floor.
-# The three runs are interleaved ROUNDS times; the medians per copy and their ratios are
-# printed.
+# sent by `pelmo send --group`, as plain text and as rich text (HTML), each against smtp-source
+# sending as many messages of the same size as that format's copy (base64 makes a copy larger
+# than its text) with one connection per message, the protocol's floor. The four runs are
+# interleaved ROUNDS times; the medians per copy and their ratios are printed.
 # Usage: bench-send.sh PATH-TO-PELMO [COPIES] [ROUNDS]
 set -euo pipefail
 
@@ -38,47 +38,62 @@ python3 -c 'print(("Dear {toName}, " + "x" * 70 + "\n") * 240, end="")' > "$work
 python3 -c 'print("<html><body>" + ("<p>Dear <b>{toName}</b>, " + "x" * 60 + "</p>\n") * 240 + "</body></html>")' \
   > "$work/message.html"
 
+# pelmo FORMAT MESSAGE-FILE [OPTION...]: `pelmo send` over the group.
+send_group() {
+  "$pelmo" send --group Bench --subject "Bench for {toName}" --message "$work/$2" \
+    --set serverAddress=127.0.0.1 --set serverPort="$port" --set senderEmail=bench@example.org \
+    --set senderName=Bench --set selectedContentType="$1" --set selectedAuthentication=0 \
+    --set useSSL=false "${@:3}"
+}
+
+# The size of the first copy in FORMAT, as smtp-source's message size.
+copy_size() {
+  send_group "$@" --preview 1 | wc -c
+}
+
 # pelmo FORMAT MESSAGE-FILE: one run over the group; the time goes to standard output.
 run_pelmo() {
   local start end sent
   start=$(date +%s.%N)
-  "$pelmo" send --group Bench --subject "Bench for {toName}" --message "$work/$2" \
-    --set serverAddress=127.0.0.1 --set serverPort="$port" --set senderEmail=bench@example.org \
-    --set senderName=Bench --set selectedContentType="$1" --set selectedAuthentication=0 \
-    --set useSSL=false > "$work/pelmo.out"
+  send_group "$@" > "$work/pelmo.out"
   end=$(date +%s.%N)
   sent=$(grep -c '^Message sent. Closing the connection.$' "$work/pelmo.out" || true)
   [ "$sent" -eq "$copies" ] || { echo "bench-send: pelmo sent $sent of $copies copies" >&2; exit 1; }
   python3 -c "print($end - $start)"
 }
 
+# smtp-source SIZE: as many messages of SIZE bytes, one connection each.
 run_source() {
   local start end
   start=$(date +%s.%N)
-  /usr/sbin/smtp-source -s 1 -m "$copies" -l 20480 -f bench@example.org -t reader@example.org \
+  /usr/sbin/smtp-source -s 1 -m "$copies" -l "$1" -f bench@example.org -t reader@example.org \
     127.0.0.1:"$port"
   end=$(date +%s.%N)
   python3 -c "print($end - $start)"
 }
 
+plain_size=$(copy_size 1 message.txt)
+rich_size=$(copy_size 0 message.html)
 : > "$work/times"
 for _ in $(seq "$rounds"); do
   echo "plain $(run_pelmo 1 message.txt)" >> "$work/times"
+  echo "source-plain $(run_source "$plain_size")" >> "$work/times"
   echo "rich $(run_pelmo 0 message.html)" >> "$work/times"
-  echo "source $(run_source)" >> "$work/times"
+  echo "source-rich $(run_source "$rich_size")" >> "$work/times"
 done
-python3 - "$work/times" "$copies" "$(dirname "$0")" <<'PY'
+python3 - "$work/times" "$copies" "$(dirname "$0")" "$plain_size" "$rich_size" <<'PY'
 import sys
 sys.path.insert(0, sys.argv[3])
 from bench_medians import per_copy
 copies = int(sys.argv[2])
+sizes = {"plain": int(sys.argv[4]), "rich": int(sys.argv[5])}
 per, rounds = per_copy(sys.argv[1], copies)
-print(f"mailing run, {copies} copies of 20 KB through smtp-sink, medians of {rounds} "
+print(f"mailing run, {copies} copies of a 20 KB text through smtp-sink, medians of {rounds} "
       f"interleaved rounds, per copy (whole process):")
 for kind in ("plain", "rich"):
-    print(f"  pelmo send, {kind} text: {per[kind]:.2f} ms, ratio to smtp-source "
-          f"{per[kind] / per['source']:.2f}")
-print(f"  smtp-source: {per['source']:.2f} ms")
+    source = per["source-" + kind]
+    print(f"  pelmo send, {kind} text ({sizes[kind]:,} bytes a copy): {per[kind]:.2f} ms; "
+          f"smtp-source, same size: {source:.2f} ms; ratio {per[kind] / source:.2f}")
 PY
 
 # The same message to 30 members through a relay that holds each direction 10 ms, as a server
