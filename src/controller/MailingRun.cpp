@@ -12,6 +12,7 @@
 #include "controller/SentRecipients.h"
 #include "relink/Relink.h"
 #include "relink/SuffixMap.h"
+#include "smtp/EncodedAttachments.h"
 #include "smtp/SMTP.h"
 #include "smtp/SmtpSession.h"
 #include "util/LocalizedStrings.h"
@@ -30,7 +31,9 @@ QString now() {
 
 } // namespace
 
-MailingRun::MailingRun(const Parts& parts, QObject* parent) : QObject(parent), m_parts(parts) {
+MailingRun::MailingRun(const Parts& parts, QObject* parent)
+    : QObject(parent), m_parts(parts),
+      m_encodedAttachments(std::make_shared<EncodedAttachments>()) {
     m_paceTimer.setSingleShot(true);
     // A coarse timer may fire a little early, and the copy would then wait once more.
     m_paceTimer.setTimerType(Qt::PreciseTimer);
@@ -330,6 +333,7 @@ DeliveryRequest MailingRun::buildRequest() {
                    to.recipientName + QLatin1String(" <") + to.recipient + QLatin1Char('>'));
         });
     request.credentials = credentialsFrom(m_parts.settings, m_parts.passwords, this);
+    request.encodedAttachments = m_encodedAttachments;
     return request;
 }
 

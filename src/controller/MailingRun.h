@@ -9,9 +9,11 @@
 #include <QTimer>
 
 #include <functional>
+#include <memory>
 #include <optional>
 
 class AttachmentsController;
+class EncodedAttachments;
 class MailSettings;
 class MessageTemplate;
 class NotMailedRecipients;
@@ -183,4 +185,6 @@ private:
     int m_retries = 0;
     /** How long the copy going again waits once its refused try has ended; zero for none. */
     RunPace::Duration m_backOff{0};
+    /** Every copy of the run carries the same files: each is encoded once. */
+    std::shared_ptr<EncodedAttachments> m_encodedAttachments;
 };

@@ -6,7 +6,10 @@
 #include <QString>
 #include <QStringList>
 
+class EncodedAttachments;
+
 #include <functional>
+#include <memory>
 #include <optional>
 
 /** A login for the server, or the failure that ends the delivery instead. */
@@ -54,4 +57,6 @@ struct DeliveryRequest {
     QString listUnsubscribe;
     /** Full paths; a file that cannot be read when the message is built is left out. */
     QStringList attachments;
+    /** The attachments as the run's earlier copies encoded them; null: read for this copy. */
+    std::shared_ptr<EncodedAttachments> encodedAttachments;
 };

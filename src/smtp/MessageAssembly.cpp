@@ -1,12 +1,12 @@
 #include "smtp/MessageAssembly.h"
 
+#include "smtp/EncodedAttachments.h"
+
 #include "smtp/HtmlCharset.h"
-#include "smtp/QuotedPrintable.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
 #include "util/TextUtilities.h"
 
-#include <QFile>
 #include <QFileInfo>
 #include <QRandomGenerator>
 #include <QUrl>
@@ -298,11 +298,15 @@ bool MessageAssembly::setListUnsubscribe(const QString& address) {
 }
 
 bool MessageAssembly::addAttachment(const QString& path) {
-    QFile file(path);
-    if (!file.open(QIODevice::ReadOnly))
-        return false;
-    const QByteArray bytes = file.readAll();
-    if (file.error() != QFileDevice::NoError)
+    return attach(path, EncodedAttachments::read(path));
+}
+
+bool MessageAssembly::addAttachment(const QString& path, EncodedAttachments& encoded) {
+    return attach(path, encoded.quotedPrintable(path));
+}
+
+bool MessageAssembly::attach(const QString& path, const std::optional<QByteArray>& encoded) {
+    if (!encoded)
         return false;
     const QString fileName = QFileInfo(path).fileName();
     const QByteArray name = headerText(fileName, attachmentDescription(fileName));
@@ -310,9 +314,9 @@ bool MessageAssembly::addAttachment(const QString& path) {
     if (const QString type = MimeTypeForPath(path); !type.isNull())
         setContentType(part.get(), type.toUtf8());
     g_mime_part_set_filename(part.get(), name.constData());
-    // Encoded here rather than by GMime, whose encoder writes LF bytes as line breaks, which
+    // Encoded by us rather than by GMime, whose encoder writes LF bytes as line breaks, which
     // a reader decodes as CRLF: binary files would not arrive as they left.
-    setContent(part.get(), EncodeQuotedPrintable(bytes), GMIME_CONTENT_ENCODING_QUOTEDPRINTABLE);
+    setContent(part.get(), *encoded, GMIME_CONTENT_ENCODING_QUOTEDPRINTABLE);
     g_mime_part_set_content_encoding(part.get(), GMIME_CONTENT_ENCODING_QUOTEDPRINTABLE);
     g_mime_multipart_add(message->parts.get(), GMIME_OBJECT(part.get()));
     return true;

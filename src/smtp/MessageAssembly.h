@@ -5,6 +5,9 @@
 #include <QStringList>
 
 #include <memory>
+#include <optional>
+
+class EncodedAttachments;
 
 /**
  * One message for one recipient: a multipart/mixed container (always, even with no part or a
@@ -62,6 +65,8 @@ public:
      * be read (vanished, a folder, no permission).
      */
     bool addAttachment(const QString& path);
+    /** As above, the file's encoding taken from encoded, which keeps it for the next copy. */
+    bool addAttachment(const QString& path, EncodedAttachments& encoded);
 
     /**
      * The whole message with CRLF line ends, ready for SMTP DATA (not dot-stuffed). Throws
@@ -76,6 +81,8 @@ public:
     QString messageId() const;
 
 private:
+    bool attach(const QString& path, const std::optional<QByteArray>& encoded);
+
     struct Message;
     std::unique_ptr<Message> message;
 };

@@ -1,5 +1,6 @@
 #include "smtp/SMTP.h"
 
+#include "smtp/EncodedAttachments.h"
 #include "smtp/MessageAssembly.h"
 #include "smtp/SmtpSession.h"
 #include "util/LocalizedStrings.h"
@@ -99,8 +100,12 @@ void SMTP::assemble(const DeliveryRequest& request, MessageAssembly& message) {
     }
     message.setListUnsubscribe(request.listUnsubscribe);
     // A file that has gone or cannot be read is left out without a word.
-    for (const QString& path : request.attachments)
-        message.addAttachment(path);
+    for (const QString& path : request.attachments) {
+        if (request.encodedAttachments)
+            message.addAttachment(path, *request.encodedAttachments);
+        else
+            message.addAttachment(path);
+    }
 }
 
 // Builds the message, hands it to the session and listens to the session; throws as the

@@ -3,14 +3,19 @@
 
 #include "SmtpData.h"
 #include "e2e/E2eSupport.h"
+#include "smtp/EncodedAttachments.h"
 #include "smtp/MessageAssembly.h"
 #include "smtp/QuotedPrintable.h"
 #include "util/PelmoException.h"
 
 #include <QDateTime>
 #include <QDir>
+#include <QFile>
 #include <QRandomGenerator>
 #include <gtest/gtest.h>
+
+#include <functional>
+#include <optional>
 
 namespace {
 
@@ -189,6 +194,58 @@ TEST(QuotedPrintable, EncodesExactlyAndDecodesBack) {
         for (const QByteArray& line : encoded.split('\n'))
             EXPECT_LE(line.size(), 76);
         EXPECT_TRUE(encoded.count("=\n") == encoded.count('\n') && !encoded.contains('\r'));
+    }
+}
+
+// A run encodes each attached file once; a copy must still carry the file as it is when the
+// copy is built. Each row changes the file between two copies and says what the second holds.
+TEST(EncodedAttachments, ASecondCopyCarriesTheFileAsItIsThen) {
+    struct Row {
+        const char* name;
+        std::function<void(const QString& path)> change;
+        std::optional<QByteArray> second;
+    };
+    const auto write = [](const QString& path, const QByteArray& bytes) {
+        QFile file(path);
+        ASSERT_TRUE(file.open(QIODevice::WriteOnly | QIODevice::Truncate));
+        file.write(bytes);
+    };
+    const QList<Row> rows = {
+        {"unchanged", [](const QString&) {}, QByteArray("first=3D")},
+        // Two writes may fall in one tick of the file system's clock; the edit's time does not.
+        {"rewritten, same size",
+         [&](const QString& path) {
+             write(path, "other=");
+             QFile file(path);
+             ASSERT_TRUE(file.open(QIODevice::ReadWrite));
+             file.setFileTime(QDateTime::currentDateTime().addSecs(5),
+                              QFileDevice::FileModificationTime);
+         },
+         QByteArray("other=3D")},
+        {"replaced by a new file, as an editor saves",
+         [&](const QString& path) {
+             write(path + ".new", "saved=");
+             ASSERT_TRUE(QFile::remove(path) && QFile::rename(path + ".new", path));
+         },
+         QByteArray("saved=3D")},
+        {"emptied", [&](const QString& path) { write(path, ""); }, QByteArray("")},
+        {"removed", [](const QString& path) { QFile::remove(path); }, std::nullopt},
+        {"replaced by a folder",
+         [](const QString& path) { ASSERT_TRUE(QFile::remove(path) && QDir().mkdir(path)); },
+         std::nullopt},
+    };
+    for (const Row& row : rows) {
+        QTemporaryDir dir;
+        const QString path = dir.filePath(QStringLiteral("file.pdf"));
+        write(path, "first=");
+        EncodedAttachments run;
+        EXPECT_EQ(run.quotedPrintable(path), QByteArray("first=3D")) << row.name;
+        row.change(path);
+        const std::optional<QByteArray> second = run.quotedPrintable(path);
+        EXPECT_EQ(second.has_value(), row.second.has_value()) << row.name;
+        if (second && row.second) {
+            EXPECT_EQ(second->toStdString(), row.second->toStdString()) << row.name;
+        }
     }
 }
 
