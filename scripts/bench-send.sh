@@ -96,6 +96,36 @@ for kind in ("plain", "rich"):
           f"smtp-source, same size: {source:.2f} ms; ratio {per[kind] / source:.2f}")
 PY
 
+# A 1 MB file attached to 50 copies, against smtp-source with as many messages of the same
+# size: a run reads and encodes the file once, not once a copy.
+head -c 1000000 /dev/urandom > "$work/file.pdf"
+python3 -c 'print("first name,last name,e-mail,groups")
+for i in range(50): print(f"Attached,{i:02d},attached{i:02d}@example.org,Attached")' > "$work/attached.csv"
+"$pelmo" contacts import "$work/attached.csv" > /dev/null
+attached() {
+  "$pelmo" send --group Attached --subject "Bench for {toName}" --message "$work/message.txt" \
+    --attach "$work/file.pdf" --set serverAddress=127.0.0.1 --set serverPort="$port" \
+    --set senderEmail=bench@example.org --set senderName=Bench --set selectedContentType=1 \
+    --set selectedAuthentication=0 --set useSSL=false "$@"
+}
+attached_size=$(attached --preview 1 | wc -c)
+: > "$work/attached-times"
+for _ in $(seq "$rounds"); do
+  start=$(date +%s.%N)
+  attached > /dev/null
+  end=$(date +%s.%N)
+  echo "attached $(python3 -c "print($end - $start)")" >> "$work/attached-times"
+  echo "source $(copies=50 run_source "$attached_size")" >> "$work/attached-times"
+done
+python3 - "$work/attached-times" "$(dirname "$0")" "$attached_size" <<'PY'
+import sys
+sys.path.insert(0, sys.argv[2])
+from bench_medians import per_copy
+per, rounds = per_copy(sys.argv[1], 50)
+print(f"  with a 1 MB attachment ({int(sys.argv[3]):,} bytes a copy), 50 copies: {per['attached']:.2f} ms; "
+      f"smtp-source, same size: {per['source']:.2f} ms; ratio {per['attached'] / per['source']:.2f}")
+PY
+
 # The same message to 30 members through a relay that holds each direction 10 ms, as a server
 # that far away: the server waits a copy costs, one connection a copy and with reuseConnection.
 for reuse in false true; do
