@@ -25,6 +25,8 @@ std::optional<QByteArray> EncodedAttachments::read(const QString& path) {
 }
 
 std::optional<QByteArray> EncodedAttachments::quotedPrintable(const QString& path) {
+    // Two copies' builds meet only when a delivery ends before its build does.
+    const std::lock_guard lock(m_mutex);
     struct stat status {};
     if (::stat(QFile::encodeName(path).constData(), &status) != 0) {
         m_entries.remove(path);

@@ -4,6 +4,7 @@
 #include <QHash>
 #include <QString>
 
+#include <mutex>
 #include <optional>
 
 #include <sys/types.h>
@@ -13,7 +14,7 @@
  * carries the same file, and encoding a large one for each copy took most of a copy's time.
  * A file is read again only when it changed since (another size, inode, modification or
  * status-change time), so that a copy still carries the file as it is when the copy is built.
- * Owned by the run; one thread at a time.
+ * Owned by the run and shared by its copies, which may be built on other threads.
  */
 class EncodedAttachments {
 public:
@@ -39,5 +40,6 @@ private:
         Identity identity;
         QByteArray encoded;
     };
+    std::mutex m_mutex;
     QHash<QString, Entry> m_entries;
 };

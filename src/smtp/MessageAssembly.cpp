@@ -14,6 +14,7 @@
 #include <gmime/gmime.h>
 
 #include <algorithm>
+#include <utility>
 
 namespace {
 
@@ -75,9 +76,31 @@ QByteArray headerText(const QString& text, const QString& what) {
     return text.toUtf8();
 }
 
+// The names of the header texts, as the refusals give them.
+QString subjectWhat() {
+    return LocalizedString("subject");
+}
+QString senderNameWhat() {
+    return LocalizedString("sender's name");
+}
+QString senderWhat() {
+    return LocalizedString("sender's address");
+}
+QString recipientNameWhat() {
+    return LocalizedString("recipient's name");
+}
+QString recipientWhat() {
+    return LocalizedString("recipient's address");
+}
+
 QString attachmentDescription(QString fileName) {
     std::replace_if(fileName.begin(), fileName.end(), breaksHeaderLine, QLatin1Char(' '));
     return LocalizedString("name of the attachment \"%1\"").arg(fileName);
+}
+
+QByteArray attachmentName(const QString& path) {
+    const QString fileName = QFileInfo(path).fileName();
+    return headerText(fileName, attachmentDescription(fileName));
 }
 
 // RFC 5322 3.6.4: a unique left part (128 random bits in base 36) and the sender's domain, as
@@ -209,17 +232,29 @@ struct MessageAssembly::Message {
 
     void setMailbox(GMimeAddressType type, const QString& name, const QString& address,
                     const QString& nameWhat, const QString& addressWhat);
+    /** The name's and the address's header texts; throws as setMailbox() describes. */
+    static std::pair<QByteArray, QByteArray> mailboxText(const QString& name,
+                                                         const QString& address,
+                                                         const QString& nameWhat,
+                                                         const QString& addressWhat);
 };
+
+std::pair<QByteArray, QByteArray>
+MessageAssembly::Message::mailboxText(const QString& name, const QString& address,
+                                      const QString& nameWhat, const QString& addressWhat) {
+    QByteArray nameText = headerText(name.trimmed(), nameWhat);
+    QByteArray addressText = headerText(address, addressWhat);
+    if (address.isEmpty())
+        throw PelmoException(QStringLiteral("BadAddress"),
+                             LocalizedString("The %1 is empty.").arg(addressWhat));
+    return {nameText, addressText};
+}
 
 // Both checks come before the list is touched, so a refused mailbox leaves the old one.
 void MessageAssembly::Message::setMailbox(GMimeAddressType type, const QString& name,
                                           const QString& address, const QString& nameWhat,
                                           const QString& addressWhat) {
-    const QByteArray nameText = headerText(name.trimmed(), nameWhat);
-    const QByteArray addressText = headerText(address, addressWhat);
-    if (address.isEmpty())
-        throw PelmoException(QStringLiteral("BadAddress"),
-                             LocalizedString("The %1 is empty.").arg(addressWhat));
+    const auto [nameText, addressText] = mailboxText(name, address, nameWhat, addressWhat);
     InternetAddressList* list = g_mime_message_get_addresses(mime.get(), type);
     internet_address_list_clear(list);
     const GPointer<InternetAddress> mailbox(internet_address_mailbox_new(
@@ -237,10 +272,20 @@ MessageAssembly::MessageAssembly() : message(std::make_unique<Message>()) {
 
 MessageAssembly::~MessageAssembly() = default;
 
+void MessageAssembly::checkHeaders(const QString& subject, const QString& senderName,
+                                   const QString& sender, const QString& recipientName,
+                                   const QString& recipient, const QStringList& attachments) {
+    headerText(subject, subjectWhat());
+    Message::mailboxText(senderName, sender, senderNameWhat(), senderWhat());
+    Message::mailboxText(recipientName, recipient, recipientNameWhat(), recipientWhat());
+    for (const QString& path : attachments)
+        attachmentName(path);
+}
+
 void MessageAssembly::setSubject(const QString& subject) {
     // No charset given: GMime picks the smallest that holds the text for RFC 2047 words.
-    g_mime_message_set_subject(
-        message->mime.get(), headerText(subject, LocalizedString("subject")).constData(), nullptr);
+    g_mime_message_set_subject(message->mime.get(), headerText(subject, subjectWhat()).constData(),
+                               nullptr);
     // Text that looks like an encoded word must be encoded itself, or readers would decode it;
     // GMime does, but folds inside its words when they are long, which breaks them for every
     // reader. Such a subject is written here instead.
@@ -252,16 +297,14 @@ void MessageAssembly::setSubject(const QString& subject) {
 }
 
 void MessageAssembly::setFrom(const QString& name, const QString& address) {
-    message->setMailbox(GMIME_ADDRESS_TYPE_FROM, name, address, LocalizedString("sender's name"),
-                        LocalizedString("sender's address"));
+    message->setMailbox(GMIME_ADDRESS_TYPE_FROM, name, address, senderNameWhat(), senderWhat());
     message->sender = address;
     g_mime_message_set_message_id(message->mime.get(),
                                   newMessageId(messageIdDomain(address)).constData());
 }
 
 void MessageAssembly::setTo(const QString& name, const QString& address) {
-    message->setMailbox(GMIME_ADDRESS_TYPE_TO, name, address, LocalizedString("recipient's name"),
-                        LocalizedString("recipient's address"));
+    message->setMailbox(GMIME_ADDRESS_TYPE_TO, name, address, recipientNameWhat(), recipientWhat());
     message->recipient = address;
 }
 
@@ -308,8 +351,7 @@ bool MessageAssembly::addAttachment(const QString& path, EncodedAttachments& enc
 bool MessageAssembly::attach(const QString& path, const std::optional<QByteArray>& encoded) {
     if (!encoded)
         return false;
-    const QString fileName = QFileInfo(path).fileName();
-    const QByteArray name = headerText(fileName, attachmentDescription(fileName));
+    const QByteArray name = attachmentName(path);
     const GPointer<GMimePart> part(g_mime_part_new());
     if (const QString type = MimeTypeForPath(path); !type.isNull())
         setContentType(part.get(), type.toUtf8());

@@ -27,6 +27,15 @@ public:
     MessageAssembly(const MessageAssembly&) = delete;
     MessageAssembly& operator=(const MessageAssembly&) = delete;
 
+    /**
+     * Throws as setSubject(), setFrom(), setTo() and addAttachment() would, in that order,
+     * without building anything; an attachment's name is checked whether or not its file can
+     * be read. A message whose texts pass is refused by nothing else.
+     */
+    static void checkHeaders(const QString& subject, const QString& senderName,
+                             const QString& sender, const QString& recipientName,
+                             const QString& recipient, const QStringList& attachments);
+
     void setSubject(const QString& subject);
     /**
      * The sender: the From mailbox, the envelope sender and the domain of the Message-ID.

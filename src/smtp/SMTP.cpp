@@ -6,6 +6,11 @@
 #include "util/LocalizedStrings.h"
 #include "util/TextUtilities.h"
 
+#include <QPromise>
+#include <QThreadPool>
+
+#include <memory>
+
 namespace {
 
 const char* mechanismName(int mechanism) {
@@ -79,10 +84,11 @@ SmtpSession* SMTP::takeSession() {
 
 void SMTP::startOnOpenSession() {
     trapped([this] {
+        m_succeeded = false;
         setMessage();
+        connectSession();
         status(LocalizedStringNS("Sending the message."));
-        m_state = State::Sending;
-        m_session->sendMessage();
+        sendMessage();
     });
 }
 
@@ -108,21 +114,77 @@ void SMTP::assemble(const DeliveryRequest& request, MessageAssembly& message) {
     }
 }
 
-// Builds the message, hands it to the session and listens to the session; throws as the
-// assembly does.
+// Thread-safe: the request is a copy, its attachments' cache locks itself.
+SMTP::Built SMTP::build(const DeliveryRequest& request) {
+    Built built;
+    try {
+        MessageAssembly message;
+        assemble(request, message);
+        built.bytes = message.toBytes();
+        built.sender = message.envelopeSender();
+        built.recipients = message.envelopeRecipients();
+        built.messageId = message.messageId();
+    } catch (const PelmoException& failure) {
+        built.failure = failure;
+    }
+    return built;
+}
+
+// Builds the message now; throws as the assembly does.
 void SMTP::setMessage() {
-    m_succeeded = false;
-    MessageAssembly message;
-    assemble(m_request, message);
-    m_messageId = message.messageId();
-    m_session->setMessage(message.toBytes(), message.envelopeSender(),
-                          message.envelopeRecipients());
-    connectSession();
+    m_message = build(m_request);
+    if (m_message->failure)
+        throw *m_message->failure;
+}
+
+// Building a copy is most of its work on this thread; on a worker it is mostly done by the time
+// the server has greeted and answered EHLO, and it does not hold up this thread meanwhile.
+void SMTP::buildInBackground() {
+    auto promise = std::make_shared<QPromise<Built>>();
+    m_building.setFuture(promise->future());
+    connect(&m_building, &QFutureWatcherBase::finished, this, &SMTP::messageBuilt);
+    QThreadPool::globalInstance()->start([promise, request = m_request] {
+        promise->start();
+        promise->addResult(build(request));
+        promise->finish();
+    });
+}
+
+void SMTP::messageBuilt() {
+    if (!m_session || m_state == State::Halted || m_state == State::TimedOut ||
+        m_state == State::Ended)
+        return;
+    m_message = m_building.result();
+    if (m_state == State::Building)
+        trapped([this] { sendMessage(); });
+}
+
+// The message goes to the session only now, whenever it was built, so that the session sees
+// the same calls in the same order however long the build took.
+void SMTP::sendMessage() {
+    if (!m_message) {
+        m_state = State::Building;
+        return;
+    }
+    // What the check before connecting let through does not fail to build; should it all the
+    // same, the delivery stops here, where the message is wanted.
+    if (m_message->failure)
+        throw *m_message->failure;
+    m_messageId = m_message->messageId;
+    m_session->setMessage(m_message->bytes, m_message->sender, m_message->recipients);
+    m_message.reset();
+    m_state = State::Sending;
+    m_session->sendMessage();
 }
 
 void SMTP::start() {
     trapped([this] {
-        setMessage();
+        m_succeeded = false;
+        MessageAssembly::checkHeaders(m_request.subject, m_request.senderName, m_request.sender,
+                                      m_request.recipientName, m_request.recipient,
+                                      m_request.attachments);
+        connectSession();
+        buildInBackground();
         status(LocalizedFormat("Connecting to the %@ server.", {m_request.server}));
         m_state = State::Connecting;
         m_session->connectInBackgroundAndNotify();
@@ -175,9 +237,7 @@ void SMTP::serviceInitialized() {
     }
     if (m_request.loginMechanism == 0) {
         status(LocalizedStringNS("Sending the message."));
-        m_state = State::Sending;
-        m_session->sendMessage();
-        return;
+        return sendMessage();
     }
     // The list is shown, never checked: a mechanism the server did not announce is tried all
     // the same, and its refusal arrives as authenticationFailed.
@@ -214,8 +274,7 @@ void SMTP::authenticate(const Credentials& credentials) {
 
 void SMTP::authenticationCompleted() {
     status(LocalizedStringNS("Authentication completed. Sending the message."));
-    m_state = State::Sending;
-    m_session->sendMessage();
+    sendMessage();
 }
 
 void SMTP::authenticationFailed() {

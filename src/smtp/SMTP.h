@@ -2,8 +2,11 @@
 
 #include "smtp/DeliveryRequest.h"
 
+#include <QFutureWatcher>
 #include <QObject>
 #include <QPointer>
+
+#include <optional>
 
 class MessageAssembly;
 class SmtpSession;
@@ -32,6 +35,7 @@ public:
         Upgrading,           ///< STARTTLS under way
         AwaitingCredentials, ///< the login asked for, not yet answered
         Authenticating,      ///< credentials sent
+        Building,            ///< the server is ready for the message, still being built
         Sending,             ///< message handed to the session
         Closing,             ///< QUIT sent after success, a refused login or a refused message
         Stalled,             ///< an unknown login mechanism: nothing sent, connection open
@@ -47,7 +51,11 @@ public:
     SMTP(DeliveryRequest request, SmtpSession* session, QObject* parent = nullptr);
     ~SMTP() override;
 
-    /** Builds the message and starts connecting; returns at once. */
+    /**
+     * Checks the message's header texts (a refusal halts the delivery before any connection),
+     * then builds the message on a worker thread while connecting; returns at once. The
+     * message goes out once the server and the message are both ready.
+     */
     void start();
     /**
      * Builds the message and sends it over the session given at construction, which an
@@ -99,7 +107,20 @@ Q_SIGNALS:
     void finished();
 
 private:
+    /** A message built, or why it could not be. */
+    struct Built {
+        QByteArray bytes;
+        QString sender;
+        QStringList recipients;
+        QString messageId;
+        std::optional<PelmoException> failure;
+    };
+    static Built build(const DeliveryRequest& request);
+    void buildInBackground();
+    void messageBuilt();
     void setMessage();
+    /** Sends the message, or waits in Building until it is built. */
+    void sendMessage();
     void connectSession();
     void connectionEstablished();
     void serviceInitialized();
@@ -129,4 +150,7 @@ private:
     QString m_messageId;
     bool m_keep = false;
     bool m_messageWritten = false;
+    /** Built, not yet handed to the session. */
+    std::optional<Built> m_message;
+    QFutureWatcher<Built> m_building;
 };

@@ -2,6 +2,7 @@
 #include "ScriptedSession.h"
 
 #include "addressbook/ImportedContact.h"
+#include "attachments/AttachmentsController.h"
 #include "controller/MessageTemplate.h"
 #include "controller/NotMailedRecipients.h"
 #include "controller/RecipientSelection.h"
@@ -286,6 +287,14 @@ const Scenario kScenarios[] = {
     {"temporary_refusal_given_up",
      {setting("retryTemporaryFailures", true), server({"--defer-recipient", "ann@example.org=9"}),
       group(kClub), choose, send, received}},
+    // A file name that cannot go into a header halts the copy before the server is bothered,
+    // though the message itself is built while connecting.
+    {"attachment_bad_name",
+     {[](Run& run) {
+          run.controller->getAttachments().addFiles(
+              {QStringLiteral(PELMO_TEST_DATA "/runs/no\nsuch.pdf")});
+      },
+      send}},
     // The address recorded is the one the copy went to, whatever To says by then.
     {"to_edited_while_sending",
      {[](Run& run) { run.script.onSend = [&run] { run.view.toText = "typed@example.org"; }; },
