@@ -1538,5 +1538,9 @@
         <source>The server %1 refused RSET: %2</source>
         <translation>Der Server %1 hat RSET abgelehnt: %2</translation>
     </message>
+    <message>
+        <source>TLS is not available on this connection to %1.</source>
+        <translation>TLS ist für diese Verbindung zu %1 nicht verfügbar.</translation>
+    </message>
 </context>
 </TS>

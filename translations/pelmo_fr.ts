@@ -1538,5 +1538,9 @@
         <source>The server %1 refused RSET: %2</source>
         <translation>Le serveur %1 a refusé RSET : %2</translation>
     </message>
+    <message>
+        <source>TLS is not available on this connection to %1.</source>
+        <translation>TLS n’est pas disponible pour cette connexion à %1.</translation>
+    </message>
 </context>
 </TS>

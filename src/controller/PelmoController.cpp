@@ -254,11 +254,14 @@ void PelmoController::groupRefusedMembers() {
 SmtpSession* PelmoController::createSession(const QString& host, int port) {
     if (sessionFactory)
         return sessionFactory(host, port);
-    auto* client = new SmtpClient(host, static_cast<quint16>(port),
-                                  std::chrono::seconds(defaults.integer(Key::SmtpTimeout)));
     // Port 465 is implicit TLS by itself; the implicit-TLS setting is for servers that use it
-    // elsewhere.
-    if (defaults.boolean(Key::ImplicitTLS))
+    // elsewhere. A session that will not go TLS does without the TLS library.
+    const bool implicitTLS = defaults.boolean(Key::ImplicitTLS);
+    const bool tls = implicitTLS || port == 465 || defaults.boolean(Key::UseSSL);
+    auto* client = new SmtpClient(
+        host, static_cast<quint16>(port), std::chrono::seconds(defaults.integer(Key::SmtpTimeout)),
+        nullptr, tls ? SmtpClient::Transport::TlsCapable : SmtpClient::Transport::PlainOnly);
+    if (implicitTLS)
         client->setImplicitTLS(true);
     // What the server announces as its SIZE is kept for the check before the next group run.
     connect(client, &SmtpSession::serviceInitialized, this, [this, client, host, port] {

@@ -10,6 +10,7 @@
 #include <QRegularExpression>
 #include <QSet>
 #include <QSslSocket>
+#include <QTcpSocket>
 #include <QUrl>
 
 #include <netinet/in.h>
@@ -150,21 +151,25 @@ QList<QSslCertificate> readCaCertificates(const QString& file, const QString& fo
 } // namespace
 
 SmtpClient::SmtpClient(const QString& host, quint16 port, std::chrono::seconds timeout,
-                       QObject* parent)
-    : SmtpSession(parent), m_socket(new QSslSocket(this)), m_host(host), m_port(port),
+                       QObject* parent, Transport transport)
+    : SmtpSession(parent),
+      m_tls(transport == Transport::TlsCapable ? new QSslSocket(this) : nullptr),
+      m_socket(m_tls ? m_tls : new QTcpSocket(this)), m_host(host), m_port(port),
       m_timeoutCap(timeout), m_implicitTLS(port == 465) {
     m_timer.setSingleShot(true);
     connect(&m_timer, &QTimer::timeout, this, &SmtpClient::onTimeout);
-    connect(m_socket, &QSslSocket::connected, this, &SmtpClient::onConnected);
-    connect(m_socket, &QSslSocket::encrypted, this, &SmtpClient::onEncrypted);
-    connect(m_socket, &QSslSocket::readyRead, this, &SmtpClient::readReplies);
-    connect(m_socket, &QSslSocket::errorOccurred, this, &SmtpClient::onSocketError);
-    connect(m_socket, &QSslSocket::disconnected, this, &SmtpClient::onDisconnected);
-    connect(m_socket, &QSslSocket::sslErrors, this,
-            [this](const QList<QSslError>& errors) { m_sslErrors = errors; });
+    connect(m_socket, &QTcpSocket::connected, this, &SmtpClient::onConnected);
+    connect(m_socket, &QTcpSocket::readyRead, this, &SmtpClient::readReplies);
+    connect(m_socket, &QTcpSocket::errorOccurred, this, &SmtpClient::onSocketError);
+    connect(m_socket, &QTcpSocket::disconnected, this, &SmtpClient::onDisconnected);
+    if (m_tls) {
+        connect(m_tls, &QSslSocket::encrypted, this, &SmtpClient::onEncrypted);
+        connect(m_tls, &QSslSocket::sslErrors, this,
+                [this](const QList<QSslError>& errors) { m_sslErrors = errors; });
+    }
     // A large message on a slow link may take long to write: the end-of-data limit counts
     // from the last progress, not from the start.
-    connect(m_socket, &QSslSocket::bytesWritten, this, [this] {
+    connect(m_socket, &QTcpSocket::bytesWritten, this, [this] {
         if (m_state == State::DataEnd)
             startTimer(dataEndLimit);
     });
@@ -209,7 +214,7 @@ void SmtpClient::setImplicitTLS(bool implicit) {
 }
 
 bool SmtpClient::isSSL() const {
-    return m_implicitTLS || m_socket->isEncrypted();
+    return m_implicitTLS || (m_tls && m_tls->isEncrypted());
 }
 
 void SmtpClient::startSSL() {
@@ -220,6 +225,8 @@ void SmtpClient::startSSL() {
 void SmtpClient::startTLS() {
     if (!expect(State::Ready, "startTLS") || isSSL())
         return;
+    if (!m_tls)
+        return failWithoutTLS();
     send("STARTTLS");
     enter(State::StartTLS);
 }
@@ -773,13 +780,19 @@ void SmtpClient::onQuit(int code) {
 
 // The trust store is read only when a session really goes TLS.
 void SmtpClient::startEncryption(State handshake) {
-    m_socket->setSslConfiguration(tlsConfiguration());
+    if (!m_tls)
+        return failWithoutTLS();
+    m_tls->setSslConfiguration(tlsConfiguration());
     enter(handshake);
-    m_socket->startClientEncryption();
+    m_tls->startClientEncryption();
 }
 
 void SmtpClient::failTLS(const QString& why) {
     finish(&SmtpSession::connectionTimedOut, why);
+}
+
+void SmtpClient::failWithoutTLS() {
+    failTLS(tr("TLS is not available on this connection to %1.").arg(m_host));
 }
 
 QByteArray SmtpClient::ehloDomain() const {

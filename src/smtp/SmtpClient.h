@@ -14,9 +14,11 @@
 #include <optional>
 
 class QSslSocket;
+class QTcpSocket;
 
 /**
- * The SMTP transport (RFC 5321) over QSslSocket: one object per connection and message, owned
+ * The SMTP transport (RFC 5321) over QSslSocket, or a plain QTcpSocket for a session that will
+ * never use TLS: one object per connection and message, owned
  * by its creator. Every signal is queued to the main loop, never emitted from inside the call
  * that caused it. Exactly one of connectionTerminated (after close()), connectionLost and
  * connectionTimedOut ends a session; after it the object does nothing more. An operation
@@ -82,13 +84,20 @@ public:
     static constexpr std::chrono::seconds replyLimit{5 * 60};
     static constexpr std::chrono::seconds dataEndLimit{10 * 60};
 
+    /** Whether the session can go TLS. */
+    enum class Transport {
+        TlsCapable, ///< implicit TLS, or STARTTLS when asked
+        PlainOnly,  ///< never TLS: a plain socket, which spares loading the TLS library; a
+                    ///< startSSL() or startTLS() fails the session as a failed handshake does
+    };
+
     /**
      * An unconnected session to host:port. `timeout` caps every waiting limit above (the
      * time-out setting); zero or less keeps the limits as they are.
      */
     SmtpClient(const QString& host, quint16 port,
                std::chrono::seconds timeout = std::chrono::seconds::zero(),
-               QObject* parent = nullptr);
+               QObject* parent = nullptr, Transport transport = Transport::TlsCapable);
     ~SmtpClient() override;
 
     void connectInBackgroundAndNotify() override;
@@ -163,10 +172,14 @@ private:
     void onDataEnd(int code);
     void onQuit(int code);
     void failTLS(const QString& why);
+    /** startSSL() or startTLS() on a PlainOnly session. */
+    void failWithoutTLS();
     QByteArray ehloDomain() const;
     QString replyText() const;
 
-    QSslSocket* m_socket;
+    /** The socket when it can go TLS, else null. */
+    QSslSocket* m_tls;
+    QTcpSocket* m_socket;
     QTimer m_timer;
     QString m_host;
     quint16 m_port;

@@ -12,6 +12,7 @@
 // the session is left to end by itself.
 struct Plan {
     bool closeFirst = false, implicitTls = false, startSsl = true, startTls = false;
+    bool plainOnly = false;
     std::chrono::seconds timeout = std::chrono::seconds(10);
     QString mechanism = {}, user = QStringLiteral("user"), password = {};
     QString sender = QStringLiteral("sender@example.org");
@@ -33,7 +34,9 @@ struct Outcome {
 // may arrive from inside a call into the client.
 inline Outcome drive(quint16 port, const Plan& plan) {
     Outcome out;
-    auto* client = new SmtpClient(QStringLiteral("127.0.0.1"), port, plan.timeout);
+    auto* client = new SmtpClient(QStringLiteral("127.0.0.1"), port, plan.timeout, nullptr,
+                                  plan.plainOnly ? SmtpClient::Transport::PlainOnly
+                                                 : SmtpClient::Transport::TlsCapable);
     client->setImplicitTLS(plan.implicitTls);
     const QPointer<SmtpClient> alive(client);
     int depth = 0; // above 0 while a call into the client runs

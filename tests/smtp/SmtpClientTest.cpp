@@ -41,7 +41,8 @@ std::vector<Row> rowsOf(const QStringList& files) {
             const QHash<QString, bool*> flags = {{"starttls", &plan.startTls},
                                                  {"implicit tls", &plan.implicitTls},
                                                  {"close first", &plan.closeFirst},
-                                                 {"no handshake", &plan.startSsl}};
+                                                 {"no handshake", &plan.startSsl},
+                                                 {"plain only", &plan.plainOnly}};
             for (const QString& line : sectionOf(text, name).split('\n')) {
                 const QString key = line.mid(2).section(':', 0, 0);
                 const QByteArray raw = unescape(line.section(':', 1).trimmed().toUtf8());
