@@ -7,11 +7,11 @@
 #include "controller/MessageTemplate.h"
 #include "controller/PelmoView.h"
 #include "controller/RecipientSelection.h"
-#include "smtp/MessageAssembly.h"
-#include "smtp/SMTP.h"
+#include "util/InBackground.h"
 #include "util/LocalizedStrings.h"
 
 #include <chrono>
+#include <optional>
 
 CopyPreview::CopyPreview(const Parts& parts, QObject* parent) : QObject(parent), m_parts(parts) {}
 
@@ -74,19 +74,31 @@ void CopyPreview::build() {
     // The run's page, if one is under way, is this copy's only for the time of the call.
     const QString runPage = message.page();
     message.setPage(m_page);
+    std::optional<PelmoException> failure;
     try {
         m_request = MailingRun::requestFor(
             message, m_parts.settings, m_parts.attachments, [](const DeliveryRequest&) {}, false);
-        MessageAssembly assembly;
-        SMTP::assemble(m_request, assembly);
-        m_bytes = assembly.toBytes();
-        m_state = State::Ready;
-    } catch (const PelmoException& failure) {
-        m_failure = LocalizedFormat("Error (%@): %@", {failure.name(), failure.reason()});
-        m_state = State::Failed;
+    } catch (const PelmoException& missing) {
+        failure = missing;
     }
     message.setPage(runPage);
     message.clearRecipient();
+    if (failure)
+        return fail(LocalizedFormat("Error (%@): %@", {failure->name(), failure->reason()}));
+    // A large attachment takes a while to encode: the window goes on meanwhile.
+    m_state = State::Building;
+    connect(&m_building, &QFutureWatcherBase::finished, this, &CopyPreview::built);
+    m_building.setFuture(
+        InBackground<SMTP::Built>([request = m_request] { return SMTP::build(request); }));
+}
+
+void CopyPreview::built() {
+    const SMTP::Built copy = m_building.result();
+    if (copy.failure)
+        return fail(
+            LocalizedFormat("Error (%@): %@", {copy.failure->name(), copy.failure->reason()}));
+    m_bytes = copy.bytes;
+    m_state = State::Ready;
     Q_EMIT finished();
 }
 

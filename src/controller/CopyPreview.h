@@ -1,8 +1,10 @@
 #pragma once
 
 #include "smtp/DeliveryRequest.h"
+#include "smtp/SMTP.h"
 
 #include <QByteArray>
+#include <QFutureWatcher>
 #include <QObject>
 #include <QPointer>
 #include <QString>
@@ -40,6 +42,7 @@ public:
     enum class State {
         Idle,          ///< start() not yet called
         PreparingPage, ///< the web page is downloading
+        Building,      ///< the copy is being built on a worker thread
         Ready,         ///< request() and bytes() hold the copy
         Failed,        ///< there is no such copy, or a setting is missing: failure() says why
     };
@@ -72,6 +75,7 @@ Q_SIGNALS:
 
 private:
     void build();
+    void built();
     void fail(const QString& why);
 
     Parts m_parts;
@@ -80,6 +84,7 @@ private:
     QPointer<PageDownload> m_download;
     DeliveryRequest m_request;
     QByteArray m_bytes;
+    QFutureWatcher<SMTP::Built> m_building;
     QString m_failure;
     QString m_page;
     QString m_failedPage;

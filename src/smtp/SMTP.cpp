@@ -3,13 +3,9 @@
 #include "smtp/EncodedAttachments.h"
 #include "smtp/MessageAssembly.h"
 #include "smtp/SmtpSession.h"
+#include "util/InBackground.h"
 #include "util/LocalizedStrings.h"
 #include "util/TextUtilities.h"
-
-#include <QPromise>
-#include <QThreadPool>
-
-#include <memory>
 
 namespace {
 
@@ -140,14 +136,8 @@ void SMTP::setMessage() {
 // Building a copy is most of its work on this thread; on a worker it is mostly done by the time
 // the server has greeted and answered EHLO, and it does not hold up this thread meanwhile.
 void SMTP::buildInBackground() {
-    auto promise = std::make_shared<QPromise<Built>>();
-    m_building.setFuture(promise->future());
     connect(&m_building, &QFutureWatcherBase::finished, this, &SMTP::messageBuilt);
-    QThreadPool::globalInstance()->start([promise, request = m_request] {
-        promise->start();
-        promise->addResult(build(request));
-        promise->finish();
-    });
+    m_building.setFuture(InBackground<Built>([request = m_request] { return build(request); }));
 }
 
 void SMTP::messageBuilt() {

@@ -77,6 +77,16 @@ public:
 
     /** The message a delivery of request sends, built into message (an empty one). */
     static void assemble(const DeliveryRequest& request, MessageAssembly& message);
+    /** A message built, or why it could not be. */
+    struct Built {
+        QByteArray bytes;
+        QString sender;
+        QStringList recipients;
+        QString messageId;
+        std::optional<PelmoException> failure;
+    };
+    /** The message a delivery of request sends, on any thread while nothing changes request. */
+    static Built build(const DeliveryRequest& request);
 
     State state() const { return m_state; }
     /** True once the server accepted the message. */
@@ -107,15 +117,6 @@ Q_SIGNALS:
     void finished();
 
 private:
-    /** A message built, or why it could not be. */
-    struct Built {
-        QByteArray bytes;
-        QString sender;
-        QStringList recipients;
-        QString messageId;
-        std::optional<PelmoException> failure;
-    };
-    static Built build(const DeliveryRequest& request);
     void buildInBackground();
     void messageBuilt();
     void setMessage();

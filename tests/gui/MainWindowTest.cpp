@@ -75,7 +75,9 @@ protected:
                 return QTest::mouseClick(choice, Qt::LeftButton);
         ADD_FAILURE() << "no button " << button.toStdString();
     }
-    ServerProcess server{PELMO_TEST_DIR "/smtp/smtp_server.py", {}};
+    // Each copy's acceptance takes a moment, so that the bar can be seen while one is on its
+    // way, however fast the rest goes.
+    ServerProcess server{PELMO_TEST_DIR "/smtp/smtp_server.py", {"--data-delay", "0.2"}};
     bool idle = false;
 };
 
