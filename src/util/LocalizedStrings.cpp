@@ -3,6 +3,8 @@
 #include <QCoreApplication>
 #include <QHash>
 
+#include <mutex>
+
 namespace {
 
 QHash<QString, QString>& cache() {
@@ -10,18 +12,27 @@ QHash<QString, QString>& cache() {
     return translations;
 }
 
+std::mutex& cacheLock() {
+    static std::mutex lock;
+    return lock;
+}
+
 } // namespace
 
 QString LocalizedString(const QString& key) {
     auto& known = cache();
-    const auto hit = known.constFind(key);
-    if (hit != known.constEnd())
-        return hit.value();
-    // translate() answers the key itself when no translator has it.
+    {
+        const std::lock_guard lock(cacheLock());
+        const auto hit = known.constFind(key);
+        if (hit != known.constEnd())
+            return hit.value();
+    }
+    // translate() answers the key itself when no translator has it; it is thread-safe.
     const QString translated =
         QCoreApplication::translate("LocalizedStrings", key.toUtf8().constData());
     if (translated.isNull())
         return translated;
+    const std::lock_guard lock(cacheLock());
     known.insert(key, translated);
     return translated;
 }

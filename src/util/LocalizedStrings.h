@@ -6,8 +6,8 @@
 /**
  * Every user-visible text is looked up here by its English text in the Qt translation context
  * "LocalizedStrings"; the key is its own fallback. Each key is translated once per process and
- * then served from a cache, so translators must be installed before the first lookup.
- * Main thread only.
+ * then served from a cache, so translators must be installed before the first lookup. Any
+ * thread: copies are built on workers.
  */
 QString LocalizedString(const QString& key);
 
