@@ -258,7 +258,7 @@ void MailingRun::deliver() {
         settleUnlessDelivering();
     });
     connect(delivery, &SMTP::finished, this, [this, delivery] { deliveryFinished(delivery); });
-    Q_EMIT copyStarting();
+    connect(delivery, &SMTP::aboutToSend, this, &MailingRun::copyGoingOut, Qt::DirectConnection);
     if (open) {
         ++m_sessionCopies;
         delivery->startOnOpenSession();

@@ -119,9 +119,9 @@ Q_SIGNALS:
     void completionActionWanted(int action);
     /** Nothing of this run is under way any more unless the user or a server acts. */
     void settled();
-    /** A copy is about to go out: a slot that must finish with the copies before it (their
-     * record on disk) does so before it returns. */
-    void copyStarting();
+    /** A copy is about to go to the server, once its connection is ready: a slot that must
+     * finish with the copies before it (their record on disk) does so before it returns. */
+    void copyGoingOut();
     /** The server accepted the copy to recipient, whose Message-ID is messageId. */
     void copyAccepted(const QString& recipient, const QString& messageId);
     /** With continueAfterRefusal: the member's copy was refused for reason, and the run goes

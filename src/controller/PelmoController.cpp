@@ -131,8 +131,9 @@ void PelmoController::send() {
                 [this, runId](const QString& recipient, const QString& messageId) {
                     ledger->recordSent(runId, recipient, messageId);
                 });
-        // The last accepted copy is on disk before the next one can be accepted.
-        connect(started, &MailingRun::copyStarting, ledger, &SentLedger::waitUntilDurable,
+        // The last accepted copy is on disk before the next one can be accepted; its sync
+        // overlaps the next copy's connection and greeting.
+        connect(started, &MailingRun::copyGoingOut, ledger, &SentLedger::waitUntilDurable,
                 Qt::DirectConnection);
     }
     connect(started, &MailingRun::stateChanged, ledger, [this, runId](MailingRun::State state) {

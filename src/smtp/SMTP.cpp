@@ -161,6 +161,7 @@ void SMTP::sendMessage() {
     if (m_message->failure)
         throw *m_message->failure;
     m_messageId = m_message->messageId;
+    Q_EMIT aboutToSend();
     m_session->setMessage(m_message->bytes, m_message->sender, m_message->recipients);
     m_message.reset();
     m_state = State::Sending;

@@ -107,6 +107,8 @@ public:
 Q_SIGNALS:
     /** A line for the status line and the activity log. */
     void statusMessage(const QString& text);
+    /** The message is about to go to the server; a slot connected directly finishes first. */
+    void aboutToSend();
     /** The server accepted the message for recipient, the address it was sent to. */
     void accepted(const QString& recipient);
     /** The server refused the message; its reply has been shown when readable. */
