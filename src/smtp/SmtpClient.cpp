@@ -30,7 +30,22 @@ bool isPositive(int code) {
 
 // Lone CR and lone LF become CRLF, and the message ends with a line end: RFC 5321 2.3.8
 // allows no other line ends in DATA.
+// Whether every CR is followed by LF and every LF preceded by CR.
+bool hasCrlfOnly(QByteArrayView text) {
+    for (qsizetype lf = text.indexOf('\n'); lf >= 0; lf = text.indexOf('\n', lf + 1))
+        if (lf == 0 || text[lf - 1] != '\r')
+            return false;
+    for (qsizetype cr = text.indexOf('\r'); cr >= 0; cr = text.indexOf('\r', cr + 1))
+        if (cr + 1 == text.size() || text[cr + 1] != '\n')
+            return false;
+    return true;
+}
+
 QByteArray normalizeLineEnds(const QByteArray& message) {
+    // A copy from the assembly has CRLF throughout: it is kept as it is, without a copy made on
+    // the thread that talks to the server.
+    if (message.endsWith("\r\n") && hasCrlfOnly(message))
+        return message;
     QByteArray out;
     out.reserve(message.size() + 2);
     const QByteArrayView text(message);
