@@ -84,7 +84,7 @@ void CopyPreview::build() {
     message.setPage(runPage);
     message.clearRecipient();
     if (failure)
-        return fail(LocalizedFormat("Error (%@): %@", {failure->name(), failure->reason()}));
+        return fail(failure->statusText());
     // A large attachment takes a while to encode: the window goes on meanwhile.
     m_state = State::Building;
     connect(&m_building, &QFutureWatcherBase::finished, this, &CopyPreview::built);
@@ -95,8 +95,7 @@ void CopyPreview::build() {
 void CopyPreview::built() {
     const SMTP::Built copy = m_building.result();
     if (copy.failure)
-        return fail(
-            LocalizedFormat("Error (%@): %@", {copy.failure->name(), copy.failure->reason()}));
+        return fail(copy.failure->statusText());
     m_bytes = copy.bytes;
     m_state = State::Ready;
     Q_EMIT finished();

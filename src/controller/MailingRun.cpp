@@ -452,7 +452,7 @@ void MailingRun::deliveryFinished(SMTP* delivery) {
 
 void MailingRun::halt(const PelmoException& failure) {
     m_everyCopyAccepted = false;
-    const QString text = LocalizedFormat("Error (%@): %@", {failure.name(), failure.reason()});
+    const QString text = failure.statusText();
     status(text);
     memberNotMailed(text);
     showHalted();

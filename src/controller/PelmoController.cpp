@@ -187,7 +187,7 @@ void PelmoController::sendTest(int copy) {
             request.server = getServer();
             request.port = getPort();
         } catch (const PelmoException& failure) {
-            statusMsg(LocalizedFormat("Error (%@): %@", {failure.name(), failure.reason()}));
+            statusMsg(failure.statusText());
             return Q_EMIT testSettled(false);
         }
         statusMsg(LocalizedStringNS("Test copy for %1 <%2>, to %3.")

@@ -41,7 +41,7 @@ void SMTP::trapped(Step step) {
 }
 
 void SMTP::halt(const PelmoException& failure) {
-    const QString text = LocalizedFormat("Error (%@): %@", {failure.name(), failure.reason()});
+    const QString text = failure.statusText();
     status(text);
     failed(text);
     // Nothing the server does from now on may start a step: its signals are cut, and the

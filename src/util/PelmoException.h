@@ -18,6 +18,8 @@ public:
 
     const QString& name() const noexcept { return failureName; }
     const QString& reason() const noexcept { return failureReason; }
+    /** The line the status line and the activity log show: "Error (name): reason". */
+    QString statusText() const;
     /** "name: reason" in UTF-8, valid for the life of the object. */
     const char* what() const noexcept override { return whatText.constData(); }
 
