@@ -9,6 +9,8 @@
 #include <QTextCursor>
 #include <QTextDocument>
 
+#include <algorithm>
+#include <cstring>
 #include <iterator>
 
 namespace {
@@ -56,23 +58,21 @@ QString replaceInTurn(const QString& text, const QStringList& values) {
     return copy;
 }
 
-QString replaceInOnePass(const QString& text, const QStringList& values) {
+bool isTagCharacter(QChar c) {
+    return c == u'{' || c == u'}' || c.isLetter();
+}
+
+QString replaceInOnePass(const QString& text, const QList<std::pair<qsizetype, int>>& tags,
+                         const QStringList& values) {
     QString result;
     result.reserve(text.size() + text.size() / 8);
     qsizetype done = 0;
-    for (qsizetype at = text.indexOf(QLatin1Char('{')); at >= 0;
-         at = text.indexOf(QLatin1Char('{'), at + 1)) {
-        for (size_t i = 0; i < std::size(kTags); ++i) {
-            const QLatin1String tag(kTags[i].text);
-            if (values[i].isNull() ||
-                QStringView(text).mid(at, tag.size()).compare(tag, Qt::CaseInsensitive) != 0)
-                continue;
-            result += QStringView(text).mid(done, at - done);
-            result += values[i];
-            done = at + tag.size();
-            at = done - 1;
-            break;
-        }
+    for (const auto& [at, row] : tags) {
+        if (values[row].isNull())
+            continue;
+        result += QStringView(text).mid(done, at - done);
+        result += values[row];
+        done = at + qsizetype(std::strlen(kTags[row].text));
     }
     result += QStringView(text).mid(done);
     return result;
@@ -85,6 +85,28 @@ QString requiredField(const QString& value, const char* failure, const char* rea
 }
 
 } // namespace
+
+// Where each tag stands in text, in order. Tags begin and end with a brace and hold no other,
+// so no two overlap and where they stand does not depend on their values.
+MessageTemplate::TagPositions MessageTemplate::findTags(const QString& text) {
+    TagPositions found{text, {}, false};
+    const qsizetype last = qsizetype(std::size(kTags)) - 1;
+    for (qsizetype at = text.indexOf(QLatin1Char('{')); at >= 0;
+         at = text.indexOf(QLatin1Char('{'), at + 1)) {
+        for (qsizetype row = 0; row <= last; ++row) {
+            const QLatin1String tag(kTags[row].text);
+            if (QStringView(text).mid(at, tag.size()).compare(tag, Qt::CaseInsensitive) != 0)
+                continue;
+            found.tags.append({at, int(row)});
+            const qsizetype end = at + tag.size();
+            found.touching = found.touching ||
+                             (row < last && ((at > 0 && isTagCharacter(text[at - 1])) ||
+                                             (end < text.size() && isTagCharacter(text[end]))));
+            break;
+        }
+    }
+    return found;
+}
 
 MessageTemplate::MessageTemplate(PelmoView& pelmoView, MailSettings& mailSettings, QObject* parent)
     : QObject(parent), view(pelmoView), settings(mailSettings), document(new QTextDocument(this)) {
@@ -153,15 +175,32 @@ QString MessageTemplate::replaceTags(const QString& text) {
         return {};
     // A null value (an empty field never set) leaves its tag in the text.
     QStringList values;
-    bool braced = false;
-    for (const Tag& tag : kTags) {
+    for (const Tag& tag : kTags)
         values << (this->*tag.getter)();
-        braced = braced || values.last().contains(QLatin1Char('{')) ||
-                 values.last().contains(QLatin1Char('}'));
+    // Tag after tag is the rule. One pass over the text gives the same result unless a value
+    // put in could complete a tag of a later row: one holding a brace, or one put next to
+    // letters or braces. The last row has no later one.
+    const bool braced = std::any_of(values.cbegin(), values.cend() - 1, [](const QString& value) {
+        return value.contains(QLatin1Char('{')) || value.contains(QLatin1Char('}'));
+    });
+    const TagPositions& positions = tagPositionsIn(text);
+    return braced || positions.touching ? replaceInTurn(text, values)
+                                        : replaceInOnePass(text, positions.tags, values);
+}
+
+// Every copy asks for the same few texts (the body as HTML and as plain text, the page):
+// where their tags stand is looked for once, not in every copy.
+const MessageTemplate::TagPositions& MessageTemplate::tagPositionsIn(const QString& text) {
+    constexpr qsizetype kTextsKept = 4;
+    for (const TagPositions& known : tagPositions) {
+        // The kept copy holds on to its characters, so one at the same address is that text.
+        if (known.text.constData() == text.constData() && known.text.size() == text.size())
+            return known;
     }
-    // Tag after tag is the rule; when no value holds a brace, no value can take part in
-    // another tag, and one pass over the text gives the same result.
-    return braced ? replaceInTurn(text, values) : replaceInOnePass(text, values);
+    if (tagPositions.size() >= kTextsKept)
+        tagPositions.removeFirst();
+    tagPositions.append(findTags(text));
+    return tagPositions.last();
 }
 
 QString MessageTemplate::getWebPageOrFileContents() {

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <QList>
 #include <QObject>
 #include <QString>
 
@@ -67,6 +68,16 @@ public:
     QString getWebPageOrFileContents();
 
 private:
+    /** A text replaceTags() was given and where its tags stand: offset and row of the table. */
+    struct TagPositions {
+        QString text;
+        QList<std::pair<qsizetype, int>> tags;
+        /** A tag other than the last row's stands next to a letter or brace. */
+        bool touching;
+    };
+    static TagPositions findTags(const QString& text);
+    const TagPositions& tagPositionsIn(const QString& text);
+
     PelmoView& view;
     MailSettings& settings;
     QTextDocument* document;
@@ -79,4 +90,6 @@ private:
     QString webPageOrFileContents;
     /** The name and address a copy is made for, when not the fields'. */
     std::optional<std::pair<QString, QString>> recipient;
+    /** The last few texts whose tags were replaced, oldest first. */
+    QList<TagPositions> tagPositions;
 };
