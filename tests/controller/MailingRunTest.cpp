@@ -16,6 +16,42 @@
 #include <QStandardPaths>
 #include <QTextDocument>
 
+#include <atomic>
+#include <chrono>
+#include <thread>
+
+#include <dlfcn.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace {
+
+// A slow disk under the sent ledger, while a test wants one: each sync of a ledger takes a tenth
+// of a second, and what it covered counts as on disk only once it is over.
+std::atomic<bool> slowLedgerDisk{false};
+std::atomic<off_t> ledgerBytesOnDisk{0};
+
+bool isLedger(int fd) {
+    char path[4096];
+    const ssize_t size = ::readlink(
+        QByteArray("/proc/self/fd/" + QByteArray::number(fd)).constData(), path, sizeof path);
+    return size > 0 && QByteArray(path, size).endsWith(".ledger");
+}
+
+} // namespace
+
+extern "C" int fsync(int fd) {
+    static const auto systemFsync = reinterpret_cast<int (*)(int)>(dlsym(RTLD_NEXT, "fsync"));
+    if (!slowLedgerDisk || !isLedger(fd))
+        return systemFsync(fd);
+    struct stat status {};
+    ::fstat(fd, &status);
+    std::this_thread::sleep_for(std::chrono::milliseconds(100));
+    const int result = systemFsync(fd);
+    ledgerBytesOnDisk = status.st_size;
+    return result;
+}
+
 namespace {
 
 using Script = ScriptedSession::Script;
@@ -335,5 +371,31 @@ TEST_P(RunScenario, Transcript) {
 
 INSTANTIATE_TEST_SUITE_P(Runs, RunScenario, ::testing::ValuesIn(kScenarios),
                          [](const auto& row) { return std::string(row.param.name); });
+
+// A Pelmo that dies with the machine must know everyone it mailed but the last: each copy goes
+// to the server only once the ledger's line for the one before is on disk, however slow the
+// disk.
+TEST_F(Run, EachCopyGoesOutOnlyOnceTheLastAcceptedIsOnDisk) {
+    group({"ann@example.org", "bob@example.org", "cy@example.org"})(*this);
+    choose(*this);
+    QStringList onDiskAtEachSend;
+    script.onSend = [&] {
+        const QDir data(QStandardPaths::writableLocation(QStandardPaths::GenericDataLocation) +
+                        QStringLiteral("/Orvale Software/Pelmo"));
+        QFile ledger(data.filePath(data.entryList({QStringLiteral("Sent-*.ledger")}).value(0)));
+        QByteArray onDisk = ledger.open(QIODevice::ReadOnly) ? ledger.readAll() : QByteArray();
+        onDisk.truncate(ledgerBytesOnDisk);
+        QStringList mailed;
+        for (const QByteArray& line : onDisk.split('\n'))
+            if (line.startsWith("sent\t") && onDisk.contains(line + '\n'))
+                mailed << QString::fromUtf8(line.split('\t').value(3));
+        onDiskAtEachSend << mailed.join(QLatin1Char(' '));
+    };
+    slowLedgerDisk = true;
+    runUntilSettled();
+    slowLedgerDisk = false;
+    EXPECT_EQ(onDiskAtEachSend,
+              QStringList({"", "ann@example.org", "ann@example.org bob@example.org"}));
+}
 
 } // namespace
