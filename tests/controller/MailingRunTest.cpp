@@ -385,9 +385,10 @@ TEST_F(Run, EachCopyGoesOutOnlyOnceTheLastAcceptedIsOnDisk) {
         QFile ledger(data.filePath(data.entryList({QStringLiteral("Sent-*.ledger")}).value(0)));
         QByteArray onDisk = ledger.open(QIODevice::ReadOnly) ? ledger.readAll() : QByteArray();
         onDisk.truncate(ledgerBytesOnDisk);
+        onDisk.truncate(onDisk.lastIndexOf('\n') + 1); // whole lines only
         QStringList mailed;
         for (const QByteArray& line : onDisk.split('\n'))
-            if (line.startsWith("sent\t") && onDisk.contains(line + '\n'))
+            if (line.startsWith("sent\t"))
                 mailed << QString::fromUtf8(line.split('\t').value(3));
         onDiskAtEachSend << mailed.join(QLatin1Char(' '));
     };
