@@ -1,8 +1,15 @@
 #include "ControllerFixture.h"
 
+#include "attachments/AttachmentsController.h"
+#include "controller/MailingRun.h"
 #include "controller/MessageTemplate.h"
+#include "smtp/SMTP.h"
 #include "util/PelmoException.h"
 
+#include <QCryptographicHash>
+#include <QFile>
+#include <QFont>
+#include <QRegularExpression>
 #include <QTextDocument>
 
 #include <random>
@@ -119,6 +126,93 @@ TEST_F(Tags, HtmlInEachCharacterSet) {
         const QString html = content().getHTMLMessage();
         EXPECT_EQ(html.count(QStringLiteral("<meta charset=\"%1\" />").arg(row.declared)), 1);
         EXPECT_TRUE(html.contains(QString::fromUtf8(row.body))) << html.toStdString();
+    }
+}
+
+// Every copy byte for byte as a run sends it, but for its date, Message-ID and boundaries: tags
+// in subject, body and page, names with markup characters, quotes and letters beyond ASCII, in
+// each character set and format, with files and List-Unsubscribe. tests/data/smtp/copies.txt
+// keeps a digest of each row's copy; a row whose copy differs is printed whole.
+TEST_F(Tags, CopiesByteForByte) {
+    struct Row {
+        const char* name;
+        int format, charset;
+        bool alternative, page, files;
+        const char *toName, *to, *unsubscribe;
+    };
+    const Row rows[] = {
+        {"plain_utf8", 1, 0, false, false, false, "Zoë O'Brien <& \"Co\">", "zoe@example.org", ""},
+        {"plain_ascii", 1, 1, false, false, false, "José Müller", "jose@example.org", ""},
+        {"plain_latin1", 1, 2, false, true, false, "山田 太郎", "taro@example.jp", ""},
+        {"plain_shift_jis", 1, 3, false, false, true, "山田 太郎", "taro@example.jp", ""},
+        {"plain_index_4", 1, 4, false, false, false, "Ann", "ann@example.org", ""},
+        {"plain_no_set", 1, -1, false, false, false, "José Müller", "jose@example.org", ""},
+        {"rich_utf8", 0, 0, false, true, false, "Zoë O'Brien <& \"Co\">", "zoe@example.org", ""},
+        {"rich_ascii", 0, 1, true, true, false, "José Müller", "jose@example.org",
+         "mailto:leave@example.org"},
+        {"rich_latin1", 0, 2, true, false, true, "Zoë O'Brien <& \"Co\">", "zoe@example.org",
+         "https://example.org/leave?who=1&list=2"},
+        {"rich_shift_jis", 0, 3, false, true, false, "山田 太郎", "taro@example.jp", ""},
+        {"rich_index_4", 0, 4, true, false, false, "José Müller", "jose@example.org", ""},
+        {"rich_no_set", 0, -1, false, true, true, "Ann", "ann@example.org", ""},
+    };
+    set("senderName", QString::fromUtf8("Ada “the Countess” Lovelace"));
+    view.subjectText = QString::fromUtf8("News for {toName} & <friends>, from {FROMNAME} ✓");
+    QTextDocument& body = *controller->message();
+    body.setDefaultFont(QFont(QStringLiteral("Pelmo Test"), 12));
+    body.setHtml(QString::fromUtf8(
+        "<p>Dear <b>{toName}</b> &lt;{to}&gt;,</p><p>from {fromName} ({from}) about "
+        "<i>{subject}</i>: é ü 日本 € &amp; \" ' {x}</p><p>Line\r\nafter CRLF</p>"));
+    QFile text(folder.filePath(QStringLiteral("notes.txt"))),
+        binary(folder.filePath(QStringLiteral("data.bin")));
+    ASSERT_TRUE(text.open(QIODevice::WriteOnly) && binary.open(QIODevice::WriteOnly));
+    text.write("Notes for you\nand a line\r\n.\n");
+    for (int value = 0; value < 256; ++value)
+        binary.putChar(char(value));
+    text.close(), binary.close();
+
+    QFile digests(QStringLiteral(PELMO_TEST_DATA "/smtp/copies.txt"));
+    const bool writing = qEnvironmentVariableIsSet("PELMO_WRITE_TRANSCRIPTS");
+    ASSERT_TRUE(digests.open(writing ? QIODevice::WriteOnly : QIODevice::ReadOnly));
+    const QList<QByteArray> expected =
+        writing ? QList<QByteArray>() : digests.readAll().split('\n');
+    for (const Row& row : rows) {
+        SCOPED_TRACE(row.name);
+        set("selectedContentType", row.format);
+        set("selectedCharacterSet", row.charset);
+        set("addPlainTextAlternative", row.alternative);
+        set("listUnsubscribe", QString::fromUtf8(row.unsubscribe));
+        set("serverAddress", "mail.example.org");
+        set("serverPort", 25);
+        view.nameText = QString::fromUtf8(row.toName);
+        view.toText = QString::fromUtf8(row.to);
+        content().setPage(row.page ? QString::fromUtf8("<html><body><h1>For {toName}</h1>"
+                                                       "<a href=\"mailto:{to}\">{TO}</a> ✓"
+                                                       "</body></html>")
+                                   : QString());
+        controller->getAttachments().deleteButtonClicked({});
+        if (row.files)
+            controller->getAttachments().addFiles({text.fileName(), binary.fileName()});
+        const DeliveryRequest request =
+            MailingRun::requestFor(content(), controller->settings(), controller->getAttachments(),
+                                   [](const DeliveryRequest&) {});
+        const SMTP::Built built = SMTP::build(request);
+        ASSERT_FALSE(built.failure);
+        QString wire = QString::fromLatin1(built.bytes);
+        const auto lines = QRegularExpression::MultilineOption;
+        wire.replace(QRegularExpression(QStringLiteral("^Date: .+$"), lines), "Date: DATE");
+        wire.replace(QRegularExpression(QStringLiteral("^Message-Id: <[^@]+@"), lines),
+                     "Message-Id: <ID@");
+        for (const QRegularExpressionMatch& boundary :
+             QRegularExpression(QStringLiteral("boundary=\"([^\"]+)\"")).globalMatch(wire))
+            wire.replace(boundary.captured(1), QStringLiteral("BOUNDARY"));
+        const QByteArray line =
+            row.name + QByteArray(" ") +
+            QCryptographicHash::hash(wire.toLatin1(), QCryptographicHash::Sha256).toHex().left(32);
+        if (writing)
+            digests.write(line + '\n');
+        else
+            EXPECT_TRUE(expected.contains(line)) << wire.toStdString();
     }
 }
 
