@@ -155,6 +155,10 @@ TEST_F(Tags, CopiesByteForByte) {
         {"rich_shift_jis", 0, 3, false, true, false, "山田 太郎", "taro@example.jp", ""},
         {"rich_index_4", 0, 4, true, false, false, "José Müller", "jose@example.org", ""},
         {"rich_no_set", 0, -1, false, true, true, "Ann", "ann@example.org", ""},
+        // Headers long enough to be folded, with encoded words and without.
+        {"long_headers", 0, 0, true, false, false,
+         "Maximiliane Theodora Wilhelmine von Hohenzollern-Sigmaringen, née Zoë", "max@example.org",
+         "mailto:leave-this-very-long-list-of-a-club-that-has-many-members@example.org"},
     };
     set("senderName", QString::fromUtf8("Ada “the Countess” Lovelace"));
     view.subjectText = QString::fromUtf8("News for {toName} & <friends>, from {FROMNAME} ✓");
@@ -184,6 +188,10 @@ TEST_F(Tags, CopiesByteForByte) {
         set("listUnsubscribe", QString::fromUtf8(row.unsubscribe));
         set("serverAddress", "mail.example.org");
         set("serverPort", 25);
+        if (row.name == std::string("long_headers"))
+            view.subjectText = QString::fromUtf8(
+                "A subject that goes on for longer than one line of a header may hold, with a "
+                "word or two in Ελληνικά and ✓ marks, for {toName}");
         view.nameText = QString::fromUtf8(row.toName);
         view.toText = QString::fromUtf8(row.to);
         content().setPage(row.page ? QString::fromUtf8("<html><body><h1>For {toName}</h1>"
