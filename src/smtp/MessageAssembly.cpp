@@ -1,7 +1,7 @@
 #include "smtp/MessageAssembly.h"
 
+#include "smtp/Base64Lines.h"
 #include "smtp/EncodedAttachments.h"
-
 #include "smtp/HtmlCharset.h"
 #include "util/LocalizedStrings.h"
 #include "util/PelmoException.h"
@@ -14,6 +14,7 @@
 #include <gmime/gmime.h>
 
 #include <algorithm>
+#include <cstring>
 #include <utility>
 
 namespace {
@@ -139,11 +140,22 @@ const char* charsetParameter(int characterSetIndex) {
 }
 
 // RFC 2046 4.1.1: text travels with CRLF line breaks, whatever the editor or page used.
-// Every copy passes through here: one pass that copies the runs between line ends whole.
+// Every copy passes through here: text with LF breaks only, as the editor and most pages give
+// it, is copied a line at a time.
 QString withCrlfLineEnds(const QString& text) {
     QString out;
     out.reserve(text.size() + text.size() / 32);
     qsizetype done = 0;
+    if (!text.contains(QLatin1Char('\r'))) {
+        for (qsizetype at = text.indexOf(QLatin1Char('\n')); at >= 0;
+             at = text.indexOf(QLatin1Char('\n'), done)) {
+            out += QStringView(text).mid(done, at - done);
+            out += QLatin1String("\r\n");
+            done = at + 1;
+        }
+        out += QStringView(text).mid(done);
+        return out;
+    }
     for (qsizetype at = 0; at < text.size(); ++at) {
         const QChar c = text.at(at);
         if (c != QLatin1Char('\r') && c != QLatin1Char('\n'))
@@ -202,23 +214,95 @@ void setContentType(GMimePart* part, const QByteArray& mimeType) {
     g_mime_object_set_content_type(GMIME_OBJECT(part), type.get());
 }
 
-void setContent(GMimePart* part, const QByteArray& bytes, GMimeContentEncoding encodedAs) {
-    const GPointer<GMimeStream> stream(
-        g_mime_stream_mem_new_with_buffer(bytes.constData(), static_cast<size_t>(bytes.size())));
-    const GPointer<GMimeDataWrapper> content(
-        g_mime_data_wrapper_new_with_stream(stream.get(), encodedAs));
-    g_mime_part_set_content(part, content.get());
+// What the parts carry, already encoded, kept out of GMime's tree: GMime would pass every byte
+// of it through its line-end filter, a byte at a time, for every copy. The tree holds a marker
+// in its place, which the written message has replaced by the content.
+struct Contents {
+    /** Random like a boundary, so that no header or file holds it by chance; and base64 and
+     *  quoted-printable text never hold its "=-" at all. */
+    QByteArray marker = newBoundary() + "-content-";
+    QList<QByteArray> encoded;
+
+    void set(GMimePart* part, const QByteArray& bytes, GMimeContentEncoding encodedAs) {
+        encoded.append(bytes);
+        const QByteArray placeholder = marker + QByteArray::number(encoded.size() - 1) + '.';
+        const GPointer<GMimeStream> stream(g_mime_stream_mem_new_with_buffer(
+            placeholder.constData(), static_cast<size_t>(placeholder.size())));
+        const GPointer<GMimeDataWrapper> content(
+            g_mime_data_wrapper_new_with_stream(stream.get(), encodedAs));
+        g_mime_part_set_content(part, content.get());
+        g_mime_part_set_content_encoding(part, encodedAs);
+    }
+
+    /** written, as GMime wrote it with LF line ends, with the contents in their places and
+     *  CRLF line ends. */
+    QByteArray placedIn(QByteArrayView written) const;
+};
+
+// RFC 5322 2.1: CRLF ends every line of a message; a CR already before an LF is kept, as
+// GMime's own conversion keeps it. Runs between LFs are copied whole. Writes to to, or with
+// to null only counts; answers the bytes written.
+qsizetype withCrlf(QByteArrayView bytes, char* to, char& last) {
+    qsizetype written = 0;
+    const char* from = bytes.data();
+    const char* const end = from + bytes.size();
+    while (from < end) {
+        const auto* lf = static_cast<const char*>(std::memchr(from, '\n', size_t(end - from)));
+        const qsizetype run = (lf ? lf : end) - from;
+        if (to)
+            std::memcpy(to + written, from, size_t(run));
+        written += run;
+        if (run > 0)
+            last = from[run - 1];
+        if (!lf)
+            break;
+        if (last != '\r' && to)
+            to[written] = '\r';
+        written += last != '\r';
+        if (to)
+            to[written] = '\n';
+        ++written;
+        last = '\n';
+        from = lf + 1;
+    }
+    return written;
+}
+
+QByteArray Contents::placedIn(QByteArrayView written) const {
+    // The pieces in order: the message as written, cut at the markers, and each content.
+    QList<QByteArrayView> pieces;
+    qsizetype done = 0;
+    for (qsizetype at = written.indexOf(marker); at >= 0; at = written.indexOf(marker, done)) {
+        pieces << written.sliced(done, at - done);
+        const qsizetype number = at + marker.size();
+        const qsizetype dot = written.indexOf('.', number);
+        pieces << QByteArrayView(encoded.at(written.sliced(number, dot - number).toInt()));
+        done = dot + 1;
+    }
+    pieces << written.sliced(done);
+    // Measured first, then written straight into their place: a copy may be megabytes.
+    qsizetype size = 0;
+    char last = 0;
+    for (const QByteArrayView piece : pieces)
+        size += withCrlf(piece, nullptr, last);
+    QByteArray out(size, Qt::Uninitialized);
+    qsizetype at = 0;
+    last = 0;
+    for (const QByteArrayView piece : pieces)
+        at += withCrlf(piece, out.data() + at, last);
+    return out;
 }
 
 // A base64 text part, as addBodyPart() describes it.
-GPointer<GMimePart> bodyPart(const QString& text, const QString& mimeType, int characterSetIndex) {
+GPointer<GMimePart> bodyPart(const QString& text, const QString& mimeType, int characterSetIndex,
+                             Contents& contents) {
     GPointer<GMimePart> part(g_mime_part_new());
     setContentType(part.get(), headerText(mimeType, LocalizedString("content type")));
     if (const char* charset = charsetParameter(characterSetIndex))
         g_mime_object_set_content_type_parameter(GMIME_OBJECT(part.get()), "charset", charset);
-    setContent(part.get(), bodyBytes(text, mimeType, characterSetIndex),
-               GMIME_CONTENT_ENCODING_DEFAULT);
-    g_mime_part_set_content_encoding(part.get(), GMIME_CONTENT_ENCODING_BASE64);
+    // Encoded here: GMime's encoder takes several times as long, for the same lines.
+    contents.set(part.get(), EncodeBase64Lines(bodyBytes(text, mimeType, characterSetIndex)),
+                 GMIME_CONTENT_ENCODING_BASE64);
     return part;
 }
 
@@ -229,6 +313,7 @@ struct MessageAssembly::Message {
     GPointer<GMimeMultipart> parts{newMultipart("mixed")};
     QString sender;
     QString recipient;
+    Contents contents;
 
     void setMailbox(GMimeAddressType type, const QString& name, const QString& address,
                     const QString& nameWhat, const QString& addressWhat);
@@ -310,19 +395,22 @@ void MessageAssembly::setTo(const QString& name, const QString& address) {
 
 void MessageAssembly::addBodyPart(const QString& text, const QString& mimeType,
                                   int characterSetIndex) {
-    g_mime_multipart_add(message->parts.get(),
-                         GMIME_OBJECT(bodyPart(text, mimeType, characterSetIndex).get()));
+    g_mime_multipart_add(
+        message->parts.get(),
+        GMIME_OBJECT(bodyPart(text, mimeType, characterSetIndex, message->contents).get()));
 }
 
 void MessageAssembly::addAlternativeBodyParts(const QString& plain, const QString& html,
                                               int characterSetIndex) {
     const GPointer<GMimeMultipart> alternative(newMultipart("alternative"));
-    g_mime_multipart_add(
-        alternative.get(),
-        GMIME_OBJECT(bodyPart(plain, QStringLiteral("text/plain"), characterSetIndex).get()));
-    g_mime_multipart_add(
-        alternative.get(),
-        GMIME_OBJECT(bodyPart(html, QStringLiteral("text/html"), characterSetIndex).get()));
+    g_mime_multipart_add(alternative.get(),
+                         GMIME_OBJECT(bodyPart(plain, QStringLiteral("text/plain"),
+                                               characterSetIndex, message->contents)
+                                          .get()));
+    g_mime_multipart_add(alternative.get(),
+                         GMIME_OBJECT(bodyPart(html, QStringLiteral("text/html"), characterSetIndex,
+                                               message->contents)
+                                          .get()));
     g_mime_multipart_add(message->parts.get(), GMIME_OBJECT(alternative.get()));
 }
 
@@ -358,8 +446,7 @@ bool MessageAssembly::attach(const QString& path, const std::optional<QByteArray
     g_mime_part_set_filename(part.get(), name.constData());
     // Encoded by us rather than by GMime, whose encoder writes LF bytes as line breaks, which
     // a reader decodes as CRLF: binary files would not arrive as they left.
-    setContent(part.get(), *encoded, GMIME_CONTENT_ENCODING_QUOTEDPRINTABLE);
-    g_mime_part_set_content_encoding(part.get(), GMIME_CONTENT_ENCODING_QUOTEDPRINTABLE);
+    message->contents.set(part.get(), *encoded, GMIME_CONTENT_ENCODING_QUOTEDPRINTABLE);
     g_mime_multipart_add(message->parts.get(), GMIME_OBJECT(part.get()));
     return true;
 }
@@ -370,15 +457,14 @@ QByteArray MessageAssembly::toBytes() const {
                              LocalizedString("The message has no sender or no recipient."));
     const std::unique_ptr<GMimeFormatOptions, FormatOptionsFree> options(
         g_mime_format_options_new());
-    g_mime_format_options_set_newline_format(options.get(), GMIME_NEWLINE_FORMAT_DOS);
     // RFC 2231 3, 4: long and non-ASCII file names split and percent-encoded.
     g_mime_format_options_set_param_encoding_method(options.get(),
                                                     GMIME_PARAM_ENCODING_METHOD_RFC2231);
     const GPointer<GMimeStream> stream(g_mime_stream_mem_new());
     g_mime_object_write_to_stream(GMIME_OBJECT(message->mime.get()), options.get(), stream.get());
     const GByteArray* bytes = g_mime_stream_mem_get_byte_array(GMIME_STREAM_MEM(stream.get()));
-    return QByteArray(reinterpret_cast<const char*>(bytes->data),
-                      static_cast<qsizetype>(bytes->len));
+    return message->contents.placedIn(
+        QByteArrayView(bytes->data, static_cast<qsizetype>(bytes->len)));
 }
 
 QString MessageAssembly::envelopeSender() const {

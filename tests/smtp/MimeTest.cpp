@@ -3,6 +3,7 @@
 
 #include "SmtpData.h"
 #include "e2e/E2eSupport.h"
+#include "smtp/Base64Lines.h"
 #include "smtp/EncodedAttachments.h"
 #include "smtp/MessageAssembly.h"
 #include "smtp/QuotedPrintable.h"
@@ -12,6 +13,7 @@
 #include <QDir>
 #include <QFile>
 #include <QRandomGenerator>
+#include <gmime/gmime.h>
 #include <gtest/gtest.h>
 
 #include <functional>
@@ -194,6 +196,23 @@ TEST(QuotedPrintable, EncodesExactlyAndDecodesBack) {
         for (const QByteArray& line : encoded.split('\n'))
             EXPECT_LE(line.size(), 76);
         EXPECT_TRUE(encoded.count("=\n") == encoded.count('\n') && !encoded.contains('\r'));
+    }
+}
+
+// RFC 2045 6.8: the same lines as GMime's encoder writes, at the lengths where a line or a
+// quantum fills up and around them.
+TEST(Base64Lines, SameAsGMime) {
+    QRandomGenerator random(7);
+    for (const int size : {0, 1, 2, 3, 56, 57, 58, 113, 114, 115, 171, 5000}) {
+        QByteArray bytes(size, Qt::Uninitialized);
+        std::generate(bytes.begin(), bytes.end(), [&] { return char(random.bounded(256)); });
+        QByteArray gmime(qsizetype(GMIME_BASE64_ENCODE_LEN(size)), Qt::Uninitialized);
+        int state = 0;
+        guint32 save = 0;
+        gmime.truncate(qsizetype(g_mime_encoding_base64_encode_close(
+            reinterpret_cast<const unsigned char*>(bytes.constData()), size_t(size),
+            reinterpret_cast<unsigned char*>(gmime.data()), &state, &save)));
+        EXPECT_EQ(EncodeBase64Lines(bytes).toStdString(), gmime.toStdString()) << size;
     }
 }
 
