@@ -420,8 +420,16 @@ bool MessageAssembly::setListUnsubscribe(const QString& address) {
     if (!url.isValid() || (scheme != QLatin1String("mailto") && scheme != QLatin1String("https")))
         return false;
     const QByteArray value = '<' + url.toEncoded() + '>';
+    // RFC 5322 2.1.1: 998 characters a line at most; a URL has no space to fold at.
+    if (value.size() > 998 - qsizetype(sizeof "List-Unsubscribe: ") + 1)
+        return false;
     GMimeObject* top = GMIME_OBJECT(message->mime.get());
     g_mime_object_set_header(top, "List-Unsubscribe", value.constData(), nullptr);
+    // RFC 2369 2: readers look for the URL in angle brackets. GMime would fold a long one into
+    // RFC 2047 encoded words, which no reader decodes in this header; it goes on one line.
+    g_mime_header_set_raw_value(
+        g_mime_header_list_get_header(g_mime_object_get_header_list(top), "List-Unsubscribe"),
+        (' ' + value + '\n').constData());
     if (scheme == QLatin1String("https"))
         g_mime_object_set_header(top, "List-Unsubscribe-Post", "List-Unsubscribe=One-Click",
                                  nullptr);

@@ -62,7 +62,7 @@ public:
     /**
      * Adds List-Unsubscribe (RFC 2369 3.2) with address when it is a mailto: or https: URL,
      * and with an https: one List-Unsubscribe-Post for one-click unsubscribing (RFC 8058 3.1);
-     * any other address adds nothing and answers false.
+     * any other address, or one too long for a header line, adds nothing and answers false.
      */
     bool setListUnsubscribe(const QString& address);
 
