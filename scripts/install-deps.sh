@@ -6,6 +6,7 @@ set -euo pipefail
 packages=(
   cmake g++ make ninja-build pkg-config
   qt6-base-dev qt6-qpa-plugins libqt6sql6-sqlite qtkeychain-qt6-dev shared-mime-info
+  libfontconfig-dev
   qt6-tools-dev qt6-l10n-tools qt6-translations-l10n
   libgmime-3.0-dev liblz4-dev libplist-dev
   chromium firefox-esr
