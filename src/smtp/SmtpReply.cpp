@@ -1,7 +1,5 @@
 #include "smtp/SmtpReply.h"
 
-#include <QRegularExpression>
-
 #include <algorithm>
 #include <utility>
 
@@ -21,6 +19,21 @@ bool isMechanismName(const QString& word) {
                       (c >= QLatin1Char('0') && c <= QLatin1Char('9')) || c == QLatin1Char('-') ||
                       c == QLatin1Char('_');
            });
+}
+
+// The words of an EHLO line in upper case, between spaces and "=" signs: some servers still
+// write the pre-standard "AUTH=LOGIN PLAIN". Every copy's session reads these lines.
+QList<QByteArray> ehloWords(const QByteArray& line) {
+    QList<QByteArray> words;
+    qsizetype start = 0;
+    for (qsizetype at = 0; at <= line.size(); ++at) {
+        if (at < line.size() && line[at] != ' ' && line[at] != '=')
+            continue;
+        if (at > start)
+            words.append(line.sliced(start, at - start).toUpper());
+        start = at + 1;
+    }
+    return words;
 }
 
 } // namespace
@@ -77,26 +90,24 @@ void SmtpReplyReader::clear() {
 
 // RFC 5321 4.1.1.1: every line after the first of a 250 EHLO reply is "keyword [params]".
 SmtpCapabilities SmtpCapabilities::fromEhlo(const SmtpReply& reply) {
-    // Some servers still write the pre-standard "AUTH=LOGIN PLAIN".
-    static const QRegularExpression separators(QStringLiteral("[ =]"));
     SmtpCapabilities capabilities;
     for (qsizetype i = 1; i < reply.lines.size(); ++i) {
-        const QStringList words =
-            QString::fromUtf8(reply.lines[i]).toUpper().split(separators, Qt::SkipEmptyParts);
+        const QList<QByteArray> words = ehloWords(reply.lines[i]);
         if (words.isEmpty())
             continue;
-        if (words[0] == QLatin1String("AUTH")) {
-            for (const QString& mechanism : words.mid(1))
-                if (isMechanismName(mechanism) && !capabilities.mechanisms.contains(mechanism))
+        if (words[0] == "AUTH") {
+            for (const QByteArray& word : words.mid(1))
+                if (const QString mechanism = QString::fromLatin1(word);
+                    isMechanismName(mechanism) && !capabilities.mechanisms.contains(mechanism))
                     capabilities.mechanisms += mechanism;
-        } else if (words[0] == QLatin1String("SIZE")) {
+        } else if (words[0] == "SIZE") {
             // RFC 1870 4: SIZE without a number, or 0, means no fixed limit; a negative one
             // is no limit either.
             capabilities.size = true;
             capabilities.sizeLimit = words.size() > 1 ? std::max(words[1].toLongLong(), 0LL) : 0;
-        } else if (words[0] == QLatin1String("SMTPUTF8")) {
+        } else if (words[0] == "SMTPUTF8") {
             capabilities.smtpUtf8 = true;
-        } else if (words[0] == QLatin1String("PIPELINING")) {
+        } else if (words[0] == "PIPELINING") {
             capabilities.pipelining = true;
         }
     }
