@@ -18,6 +18,7 @@
 #include <sys/socket.h>
 
 #include <algorithm>
+#include <cstring>
 #include <functional>
 #include <optional>
 #include <utility>
@@ -32,11 +33,15 @@ bool isPositive(int code) {
 // allows no other line ends in DATA.
 // Whether every CR is followed by LF and every LF preceded by CR.
 bool hasCrlfOnly(QByteArrayView text) {
-    for (qsizetype lf = text.indexOf('\n'); lf >= 0; lf = text.indexOf('\n', lf + 1))
-        if (lf == 0 || text[lf - 1] != '\r')
+    const char* const begin = text.data();
+    const char* const end = begin + text.size();
+    for (const char* lf = begin;
+         (lf = static_cast<const char*>(std::memchr(lf, '\n', size_t(end - lf)))); ++lf)
+        if (lf == begin || lf[-1] != '\r')
             return false;
-    for (qsizetype cr = text.indexOf('\r'); cr >= 0; cr = text.indexOf('\r', cr + 1))
-        if (cr + 1 == text.size() || text[cr + 1] != '\n')
+    for (const char* cr = begin;
+         (cr = static_cast<const char*>(std::memchr(cr, '\r', size_t(end - cr)))); ++cr)
+        if (cr + 1 == end || cr[1] != '\n')
             return false;
     return true;
 }
@@ -76,11 +81,17 @@ QByteArray dataBlock(const QByteArray& normalized) {
     QByteArray out;
     out.reserve(text.size() + 3);
     qsizetype done = 0;
-    for (qsizetype dot = text.indexOf('.'); dot >= 0; dot = text.indexOf('.', dot + 1)) {
-        if (dot == 0 || text[dot - 1] == '\n') {
-            out.append(text.sliced(done, dot - done)).append('.');
-            done = dot;
+    // Only a dot that starts a line is doubled: the lines are looked at, not the dots.
+    for (qsizetype start = 0; start < text.size();) {
+        if (text[start] == '.') {
+            out.append(text.sliced(done, start - done)).append('.');
+            done = start;
         }
+        const auto* lf = static_cast<const char*>(
+            std::memchr(text.data() + start, '\n', size_t(text.size() - start)));
+        if (!lf)
+            break;
+        start = lf - text.data() + 1;
     }
     return out.append(text.sliced(done)).append(".\r\n", 3);
 }
