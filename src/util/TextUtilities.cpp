@@ -164,13 +164,22 @@ void ElapsedTimeMessage(uint32_t seconds, CString256& text) {
 }
 
 QString DateDescription(const QDateTime& date) {
-    const int offset = date.offsetFromUtc() / 60;
+    // A mailing run shows the time twice a copy, most often within the same second: the text
+    // last made is kept, with the second and offset it stands for.
+    thread_local std::pair<qint64, int> described{0, 0};
+    thread_local QString description;
+    const std::pair<qint64, int> moment{date.toSecsSinceEpoch(), date.offsetFromUtc()};
+    if (moment == described && !description.isNull())
+        return description;
+    const int offset = moment.second / 60;
     const int magnitude = offset < 0 ? -offset : offset;
-    return date.toString(QStringLiteral("yyyy-MM-dd HH:mm:ss ")) +
-           QLatin1Char(offset < 0 ? '-' : '+') +
-           QStringLiteral("%1%2")
-               .arg(magnitude / 60, 2, 10, QLatin1Char('0'))
-               .arg(magnitude % 60, 2, 10, QLatin1Char('0'));
+    description = date.toString(QStringLiteral("yyyy-MM-dd HH:mm:ss ")) +
+                  QLatin1Char(offset < 0 ? '-' : '+') +
+                  QStringLiteral("%1%2")
+                      .arg(magnitude / 60, 2, 10, QLatin1Char('0'))
+                      .arg(magnitude % 60, 2, 10, QLatin1Char('0'));
+    described = moment;
+    return description;
 }
 
 QString MimeTypeForPath(const QString& path) {
