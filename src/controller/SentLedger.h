@@ -21,7 +21,7 @@
  *   end   <time> <run>                      the run completed, or the sent list was reset:
  *                                           nothing the run mailed before it is restored
  * Each copy's lines are written with one write() at once, so that a Pelmo that is killed loses
- * none, and fsync'd on a thread of their own meanwhile; the run calls waitUntilDurable() before
+ * none, and synced on a thread of their own meanwhile; the run calls waitUntilDurable() before
  * the next copy goes to the server, so that a power loss can cost at most the record of the one
  * copy just accepted, as it could with a wait right after the write. A
  * last line without its "\n" was torn by the crash and is ignored, as is any line that is not

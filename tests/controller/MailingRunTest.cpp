@@ -40,14 +40,14 @@ bool isLedger(int fd) {
 
 } // namespace
 
-extern "C" int fsync(int fd) {
-    static const auto systemFsync = reinterpret_cast<int (*)(int)>(dlsym(RTLD_NEXT, "fsync"));
+extern "C" int fdatasync(int fd) {
+    static const auto systemSync = reinterpret_cast<int (*)(int)>(dlsym(RTLD_NEXT, "fdatasync"));
     if (!slowLedgerDisk || !isLedger(fd))
-        return systemFsync(fd);
+        return systemSync(fd);
     struct stat status {};
     ::fstat(fd, &status);
     std::this_thread::sleep_for(std::chrono::milliseconds(100));
-    const int result = systemFsync(fd);
+    const int result = systemSync(fd);
     ledgerBytesOnDisk = status.st_size;
     return result;
 }
