@@ -256,9 +256,11 @@ qsizetype withCrlf(QByteArrayView bytes, char* to, char& last) {
             last = from[run - 1];
         if (!lf)
             break;
-        if (last != '\r' && to)
-            to[written] = '\r';
-        written += last != '\r';
+        if (last != '\r') {
+            if (to)
+                to[written] = '\r';
+            ++written;
+        }
         if (to)
             to[written] = '\n';
         ++written;
